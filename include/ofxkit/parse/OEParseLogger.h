@@ -1,0 +1,80 @@
+// The process-wide log of soft errors (parse warnings).
+#pragma once
+
+#include <cstdint>
+
+#include "ofxkit/core/OETagID.h"
+#include "ofxkit/types/OEDynamicArray.h"
+#include "ofxkit/types/OEString.h"
+
+class OEParseException {
+ public:
+  OEParseException();
+  OEParseException(const OEParseException& other) = default;
+  OEParseException& operator=(const OEParseException& other) = default;
+  virtual ~OEParseException();
+
+  void WarningString(OEString& out) const;
+  // The name of a warning code ("OEPW_BADFORMAT"); "" for a value out of range.
+  static const char* WarningName(OEParseWarning warning);
+
+  OEParseWarning GetWarning() const { return warning; }
+  OEDataObj* GetObject() const { return object; }
+  const OEString& GetTagName() const { return tagName; }
+  OETagID GetTag() const { return tag; }
+  const OEString& GetValue() const { return value; }
+  int32_t GetPosition() const { return position; }
+
+  OEParseWarning warning;
+  OEDataObj* object;  // not owned
+  OEString tagName;
+  OETagID tag;
+  OEString value;
+  int32_t position;  // read offset of the parsed buffer, -1 when unknown
+};
+
+template <>
+struct OEArrayElementTraits<OEParseException> {
+  static OEParseException* New();
+  static void Delete(OEParseException* p) { delete p; }
+};
+
+class OEDynamicArrayParseException : public OEDynamicArrayTyped<OEParseException> {
+ public:
+  using OEDynamicArrayTyped<OEParseException>::OEDynamicArrayTyped;
+};
+
+class OEParseLogger : public OEDynamicArrayParseException {
+ public:
+  static OEParseLogger* TheOEParseLogger();
+
+  unsigned short AppendParseException(OEParseWarning warning, OEString value, OEString tagName, OETagID tag,
+                                      OEDataObj* object);
+  unsigned short AppendParseException(OEParseException* record);
+
+  void EnableLogging(unsigned short on) { m_enabled = on; }
+  unsigned short GetLoggingEnabled() const { return m_enabled; }
+  unsigned short GetAnyParseExceptionsLogged() const { return m_anyLogged; }
+  void SetBuffer(OEBuffer* buffer) { m_buffer = buffer; }
+  OEBuffer* GetBuffer() const { return m_buffer; }
+  void SetParser(OEParser* parser) { m_parser = parser; }
+  OEParser* GetParser() const { return m_parser; }
+
+  void DeleteAll() override;
+  unsigned short DeepCopyFrom(OEParseLogger* from);
+
+ protected:
+  OEParseLogger() : OEDynamicArrayParseException(1, 1) {}
+
+ private:
+  static OEParseLogger* ms_theOEParseLogger;
+  unsigned short m_enabled = 1;
+  unsigned short m_anyLogged = 0;
+  OEBuffer* m_buffer = nullptr;
+  OEParser* m_parser = nullptr;
+};
+
+// Shorthand used by setters and conversions: logs a warning through the shared
+// log when it exists.
+void OELogWarning(OEParseWarning warning, const OEString& value, const OEString& tagName, OETagID tag,
+                  OEDataObj* object = nullptr);

@@ -1,0 +1,193 @@
+#include "ofxkit/types/OEBuffer.h"
+
+#include <cstdlib>
+#include <cstring>
+
+OEBuffer::OEBuffer(uint32_t initialSize, uint32_t growBy)
+    : m_data(nullptr), m_allocation(0), m_growBy(0), m_size(0), m_offset(0) {
+  if (initialSize > kMaxBufferSize) initialSize = kMaxBufferSize;
+  if (initialSize != 0) {
+    m_growBy = initialSize;
+    GrowBuffer(initialSize);
+    m_growBy = growBy;
+  } else {
+    m_growBy = growBy ? growBy : 512;
+    GrowBuffer(m_growBy);
+  }
+}
+
+OEBuffer::OEBuffer(const OEBuffer& other) : OEBuffer(other.m_allocation ? other.m_allocation : 0, other.m_growBy) {
+  if (m_data && other.m_data) memcpy(m_data, other.m_data, other.m_size);
+  m_size = m_data ? other.m_size : 0;
+  m_offset = m_data ? other.m_offset : 0;
+}
+
+OEBuffer& OEBuffer::operator=(const OEBuffer& other) {
+  if (this == &other) return *this;
+  m_offset = 0;
+  m_size = 0;
+  if (other.m_size > m_allocation) AllocateTo(other.m_size);
+  if (m_data && other.m_data && other.m_size <= m_allocation) {
+    memcpy(m_data, other.m_data, other.m_size);
+    m_size = other.m_size;
+    m_offset = other.m_offset;
+  }
+  m_growBy = other.m_growBy;
+  return *this;
+}
+
+OEBuffer::~OEBuffer() {
+  if (m_data) {
+    volatile char* p = m_data;
+    for (uint32_t i = 0; i < m_allocation; ++i) p[i] = 0;
+    free(m_data);
+  }
+}
+
+uint32_t OEBuffer::GrowBuffer(uint32_t n) {
+  if (n == 0 && m_growBy == 0) return 0;
+  uint32_t max = GetMaxBufferSize();
+  if (m_allocation >= max) return 0;
+  uint32_t increment = m_growBy > n ? m_growBy : n;
+  uint64_t wanted = static_cast<uint64_t>(m_allocation) + increment;
+  uint32_t newAllocation = wanted > max ? max : static_cast<uint32_t>(wanted);
+  if (newAllocation - m_allocation < n) return 0;
+  char* block = static_cast<char*>(realloc(m_data, newAllocation));
+  if (!block) {
+    g_allocFailed = 1;
+    return 0;
+  }
+  uint32_t added = newAllocation - m_allocation;
+  m_data = block;
+  m_allocation = newAllocation;
+  return added;
+}
+
+OEBufferResult OEBuffer::WriteBytes(const char* data, uint32_t n) {
+  uint64_t end = static_cast<uint64_t>(m_offset) + n;
+  if (end > m_allocation) {
+    if (end >= GetMaxBufferSize()) return OEBUF_OUTOFRANGE;
+    if (GrowBuffer(static_cast<uint32_t>(end - m_allocation)) == 0)
+      return m_growBy != 0 ? OEBUF_NOMEMORY : OEBUF_OUTOFRANGE;
+  }
+  if (!m_data) return OEBUF_NOBUFFER;
+  if (n) memcpy(m_data + m_offset, data, n);
+  m_offset = static_cast<uint32_t>(end);
+  m_size = m_offset;
+  return OEBUF_OK;
+}
+
+OEBufferResult OEBuffer::WriteLarge(const char* data, uint32_t n) {
+  while (n > 0) {
+    uint32_t chunk = n < kChunk ? n : kChunk;
+    OEBufferResult r = WriteBytes(data, chunk);
+    if (r != OEBUF_OK) return r;
+    data += chunk;
+    n -= chunk;
+  }
+  return OEBUF_OK;
+}
+
+OEBufferResult OEBuffer::Write(const OEBuffer* source) {
+  if (!source || !source->m_data) return OEBUF_NOBUFFER;
+  if (source == this) {  // appending ourselves: copy first so growth cannot move the source
+    OEBuffer copy(*this);
+    return Write(&copy);
+  }
+  return WriteLarge(source->m_data, source->m_size);
+}
+
+OEBufferResult OEBuffer::operator+=(const char* text) {
+  if (!text) return OEBUF_OK;
+  size_t n = strlen(text);
+  if (n > 65535) n = 65535;
+  return WriteBytes(text, static_cast<uint32_t>(n));
+}
+
+OEBufferResult OEBuffer::Read(char* dest) {
+  if (static_cast<uint64_t>(m_offset) + 1 > m_size) return OEBUF_OUTOFRANGE;
+  *dest = m_data[m_offset++];
+  return OEBUF_OK;
+}
+
+OEBufferResult OEBuffer::Read(char* dest, unsigned short& got, unsigned short max) {
+  if (m_offset >= m_size) return OEBUF_OUTOFRANGE;
+  uint32_t available = m_size - m_offset;
+  got = static_cast<unsigned short>(max < available ? max : available);
+  memcpy(dest, m_data + m_offset, got);
+  m_offset += got;
+  return OEBUF_OK;
+}
+
+char OEBuffer::GetCh(int32_t index) {
+  if (index < 0 || static_cast<uint32_t>(index) >= m_size || !m_data) return 0;
+  return m_data[index];
+}
+
+unsigned short OEBuffer::FindSubChar(int32_t start, char ch, int32_t* where) {
+  for (int32_t i = start;; ++i) {
+    char c = GetCh(i);
+    if (c == ch && c != 0) {
+      *where = i;
+      return 1;
+    }
+    if (c == 0) {
+      *where = i;
+      return 0;
+    }
+  }
+}
+
+unsigned short OEBuffer::GetData(OEString& out, int32_t start, unsigned short count) {
+  char* dest = out.LockBuffer(static_cast<unsigned short>(count + 1u > 0xFFFF ? 0xFFFF : count + 1u));
+  if (!dest) return 0;
+  unsigned short copied = 0;
+  while (copied < count && copied < 0xFFFE) {
+    char c = GetCh(start + copied);
+    if (c == 0) break;
+    dest[copied++] = c;
+  }
+  dest[copied] = '\0';
+  out.UnlockBuffer();
+  return copied;
+}
+
+OEBufferResult OEBuffer::CopyBuffer(OEBuffer* dest, uint32_t offset, uint32_t count) {
+  if (!dest) return OEBUF_NOBUFFER;
+  if (offset > m_size) return OEBUF_OUTOFRANGE;
+  if (count == 0) count = m_size - offset;
+  if (static_cast<uint64_t>(offset) + count > m_size) return OEBUF_OUTOFRANGE;
+  if (count > dest->m_allocation && dest->AllocateTo(count) != OEBUF_OK) return OEBUF_NOMEMORY;
+  if (count) {
+    if (!dest->m_data || !m_data) return OEBUF_NOBUFFER;
+    memmove(dest->m_data, m_data + offset, count);
+    dest->m_size = count;
+    dest->m_offset = count;
+  } else {
+    dest->m_size = dest->m_offset;
+  }
+  return OEBUF_OK;
+}
+
+unsigned short OEBuffer::CompareBuffer(OEBuffer* other) {
+  if (!other || !m_data || !other->m_data || m_size != other->m_size) return 0;
+  return memcmp(m_data, other->m_data, m_size) == 0;
+}
+
+void OEBuffer::ClearBuffer(char c) {
+  if (m_data) memset(m_data, c, m_size);
+  m_size = m_offset;
+  m_offset = 0;
+}
+
+OEBufferResult OEBuffer::AllocateTo(uint32_t n) {
+  if (m_allocation >= n) return OEBUF_OK;
+  uint32_t missing = n - m_allocation;
+  return GrowBuffer(missing) < missing ? OEBUF_NOMEMORY : OEBUF_OK;
+}
+
+unsigned short OEBuffer::SetBufferOffset(uint32_t n) {
+  if (n > m_size) return 0;
+  m_offset = n;
+  return 1;
+}

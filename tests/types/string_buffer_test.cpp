@@ -1,0 +1,220 @@
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <string>
+
+#include "ofxkit/ofxkit.h"
+
+TEST(OEString, LimitIsAdvisoryAndSurvivesAssignment) {
+  OEString32 s;
+  std::string forty(40, 'x');
+  s = forty.c_str();
+  EXPECT_EQ(s.GetStrLength(), 40);
+  EXPECT_FALSE(s.IsValid());
+  EXPECT_TRUE(s.ExceedsSpecLength());
+  s.TruncateToSpec();
+  EXPECT_EQ(s.GetStrLength(), 32);
+  EXPECT_TRUE(s.IsValid());
+
+  s = "";
+  EXPECT_TRUE(s.IsNull());
+  EXPECT_EQ(s.SpecLength(), 32);
+  EXPECT_STREQ(static_cast<const char*>(s), "");
+
+  // Assigning a string with another limit keeps the fixed limit.
+  OEString unlimited("abc");
+  s = unlimited;
+  EXPECT_EQ(s.SpecLength(), 32);
+  EXPECT_EQ(s, "abc");
+  // ... while a plain string takes the source's limit.
+  OEString plain;
+  plain = s;
+  EXPECT_EQ(plain.SpecLength(), 32);
+
+  OEString3 three("abc");
+  OEString3 copied(three);
+  OEString3 assigned;
+  assigned = three;
+  EXPECT_EQ(copied.SpecLength(), 3);
+  EXPECT_EQ(assigned.SpecLength(), 3);
+  EXPECT_EQ(assigned, "abc");
+}
+
+TEST(OEString, NullAndEmptyCompareEqual) {
+  OEString empty("");
+  OEString null;
+  EXPECT_TRUE(empty == null);
+  EXPECT_TRUE(empty == "");
+  EXPECT_TRUE(null == static_cast<const char*>(nullptr));
+  EXPECT_FALSE(null == "a");
+  EXPECT_TRUE(null != "a");
+  EXPECT_EQ(OEString("Bank").strcmpi("bANK"), 1);
+  EXPECT_EQ(OEString("Bank").strcmpi("Banks"), 0);
+  EXPECT_EQ(OEString().strcmpi(""), 1);
+  EXPECT_EQ(OEString("a").strcmpi(nullptr), 0);
+  EXPECT_FALSE(OEString("ab") == OEString("abc"));
+}
+
+TEST(OEString, ClearLockAndAppend) {
+  OEString s;
+  char* p = s.LockBuffer(10);
+  ASSERT_NE(p, nullptr);
+  strcpy(p, "abc");
+  s.UnlockBuffer();
+  EXPECT_EQ(s.GetStrLength(), 3);
+  s.Clear('*');
+  EXPECT_EQ(s, "*********");
+  s.Clear(0);
+  EXPECT_TRUE(s.IsEmpty());
+  EXPECT_FALSE(s.IsNull());  // the block stays
+
+  OEString t("ab");
+  t += 'c';
+  t += '\0';
+  t += "de";
+  t += static_cast<const char*>(nullptr);
+  EXPECT_EQ(t, "abcde");
+  // Appending part of itself must not read freed memory.
+  t += static_cast<const char*>(t);
+  EXPECT_EQ(t, "abcdeabcde");
+  t = t + 5;
+  EXPECT_EQ(t, "abcde");
+
+  OEString a("x"), b("y");
+  b.SetEncoding(OE_ENCODE_CDATA);
+  OEString c = a + b;
+  EXPECT_EQ(c, "xy");
+  EXPECT_EQ(c.GetEncoding(), OE_ENCODE_CDATA);
+  EXPECT_EQ(c.SpecLength(), OEString::kNoLimit);
+}
+
+TEST(OEString, BlanksAndCase) {
+  OEString ws(" \t\r\n");
+  EXPECT_TRUE(ws.IsWhiteSpace());
+  EXPECT_FALSE(OEString(" a ").IsWhiteSpace());
+  EXPECT_TRUE(OEString().IsWhiteSpace());
+
+  OEString s("  Hello World  ");
+  s.TrimLeadingSpaces();
+  s.TrimTrailingSpaces();
+  EXPECT_EQ(s, "Hello World");
+  s.MakeUpper();
+  EXPECT_EQ(s, "HELLO WORLD");
+  s.MakeLower();
+  EXPECT_EQ(s, "hello world");
+  OEString tabs("\tx\t");
+  tabs.TrimTrailingSpaces();
+  EXPECT_EQ(tabs.GetStrLength(), 3);  // only spaces are trimmed
+}
+
+TEST(OEString, OverlongTextIsRefused) {
+  std::string huge(70000, 'a');
+  OEString s("keep");
+  s = huge.c_str();
+  EXPECT_TRUE(s.IsNull());  // cannot be held in a 16-bit length
+  std::string max(65534, 'b');
+  s = max.c_str();
+  EXPECT_EQ(s.GetStrLength(), 65534);
+}
+
+TEST(OEString, SpecialLimits) {
+  OEUserPassword pw;
+  EXPECT_EQ(pw.SpecLength(), 171);
+  pw.SetSpecLength32();
+  pw = OEString("secret");
+  EXPECT_EQ(pw.SpecLength(), 32);
+
+  OEEMailMsgBody body;
+  EXPECT_FALSE(body.IsValid());  // empty
+  body = std::string(2160, 'm').c_str();
+  EXPECT_TRUE(body.IsValid());
+  body = std::string(2161, 'm').c_str();
+  EXPECT_FALSE(body.IsValid());
+  OEString10000 longText("text");
+  body = longText;
+  EXPECT_EQ(body.SpecLength(), 10000);
+  body = OEString("text");
+  EXPECT_EQ(body.SpecLength(), 2000);
+
+  OEMultiLenString multi;
+  multi.SetSpecLength(12);
+  multi = OEString("abc");
+  EXPECT_EQ(multi.SpecLength(), 12);
+}
+
+TEST(OEBuffer, GrowthAndCeiling) {
+  OEBuffer b;
+  EXPECT_EQ(b.GetBufferAllocation(), 512u);
+  std::string bytes(513, 'z');
+  EXPECT_EQ(b.WriteLarge(bytes.data(), 513), OEBUF_OK);
+  EXPECT_EQ(b.GetBufferAllocation(), 1024u);
+  EXPECT_EQ(b.GetBufferSize(), 513u);
+
+  OEBuffer big(100, 0);
+  EXPECT_EQ(big.GetBufferAllocation(), 100u);
+  // With no growth step the buffer grows by exactly what a write needs.
+  EXPECT_EQ(big.WriteLarge(bytes.data(), 150), OEBUF_OK);
+  EXPECT_EQ(big.GetBufferAllocation(), 150u);
+
+  OEBuffer nearly(3999990, 16);
+  std::string filler(3999990, 'f');
+  ASSERT_EQ(nearly.WriteLarge(filler.data(), 3999990), OEBUF_OK);
+  EXPECT_EQ(nearly.Write("0123456789", 10), OEBUF_OUTOFRANGE);  // would end at 4,000,000
+  EXPECT_EQ(nearly.GetBufferSize(), 3999990u);
+  EXPECT_EQ(nearly.Write("012345678", 9), OEBUF_OK);
+}
+
+TEST(OEBuffer, ReadAccessAndRewind) {
+  OEBuffer b;
+  b += "hello";
+  b += 'x';
+  EXPECT_EQ(b.GetCh(-1), 0);
+  EXPECT_EQ(b.GetCh(static_cast<int32_t>(b.GetBufferSize())), 0);
+  EXPECT_EQ(b.GetCh(0), 'h');
+  int32_t where = -1;
+  EXPECT_EQ(b.FindSubChar(0, 'l', &where), 1);
+  EXPECT_EQ(where, 2);
+  EXPECT_EQ(b.FindSubChar(0, 'q', &where), 0);
+  EXPECT_EQ(where, 6);
+  OEString out;
+  EXPECT_EQ(b.GetData(out, 1, 3), 3);
+  EXPECT_EQ(out, "ell");
+
+  b.ClearBuffer(0);  // size stays, offset rewinds
+  EXPECT_EQ(b.GetBufferSize(), 6u);
+  EXPECT_EQ(b.GetBufferOffset(), 0u);
+  char c;
+  EXPECT_EQ(b.Read(&c), OEBUF_OK);
+  EXPECT_EQ(b.SetBufferOffset(7), 0);
+  EXPECT_EQ(b.SetBufferOffset(6), 1);
+  EXPECT_EQ(b.Read(&c), OEBUF_OUTOFRANGE);
+
+  OEBuffer w;
+  w += "abcdef";
+  w.SetBufferOffset(2);
+  w += "Z";  // writing makes the written end the logical end
+  EXPECT_EQ(w.GetBufferSize(), 3u);
+}
+
+TEST(OEBuffer, CopyAppendCompare) {
+  OEBuffer a, b;
+  a += "0123456789";
+  EXPECT_EQ(a.CopyBuffer(&b, 2, 3), OEBUF_OK);
+  EXPECT_EQ(b.GetBufferSize(), 3u);
+  EXPECT_EQ(b.GetCh(0), '2');
+  EXPECT_EQ(a.CopyBuffer(&b, 8, 5), OEBUF_OUTOFRANGE);
+  EXPECT_EQ(a.CopyBuffer(&b, 0, 0), OEBUF_OK);
+  EXPECT_EQ(a.CompareBuffer(&b), 1);
+  b += &a;
+  EXPECT_EQ(b.GetBufferSize(), 20u);
+  b += &b;  // appending itself doubles it
+  EXPECT_EQ(b.GetBufferSize(), 40u);
+  EXPECT_EQ(a.CompareBuffer(&b), 0);
+  OEBuffer copy(a);
+  EXPECT_EQ(copy.CompareBuffer(&a), 1);
+  unsigned short got = 0;
+  char dest[4];
+  a.SetBufferOffset(8);
+  EXPECT_EQ(a.Read(dest, got, 4), OEBUF_OK);
+  EXPECT_EQ(got, 2);
+}
