@@ -46,6 +46,8 @@ OEParseLogger* OEParseLogger::TheOEParseLogger() {
 unsigned short OEParseLogger::AppendParseException(OEParseWarning warning, OEString value, OEString tagName,
                                                    OETagID tag, OEDataObj* object) {
   m_anyLogged = 1;
+  ++m_reportCount;
+  m_lastReported = warning;
   if (!m_enabled) return 1;
   OEDataObjFactory* factory = Factory();
   OEParseException* record = factory ? factory->NewParseException() : nullptr;
@@ -69,6 +71,8 @@ unsigned short OEParseLogger::AppendParseException(OEParseWarning warning, OEStr
 unsigned short OEParseLogger::AppendParseException(OEParseException* record) {
   m_anyLogged = 1;
   if (!record) return 0;
+  ++m_reportCount;
+  m_lastReported = record->warning;
   if (!m_enabled) {
     delete record;  // the log keeps no reference, so it does not leak it either
     return 1;

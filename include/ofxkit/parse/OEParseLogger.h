@@ -61,6 +61,11 @@ class OEParseLogger : public OEDynamicArrayParseException {
   OEParser* GetParser() const { return m_parser; }
 
   void DeleteAll() override;
+  // Counts every warning reported since the log was made, kept or not, and
+  // remembers the code of the last one: setters use it to tell whether a
+  // conversion they ran quietly found a fault.
+  uint32_t GetReportCount() const { return m_reportCount; }
+  OEParseWarning GetLastReported() const { return m_lastReported; }
   unsigned short DeepCopyFrom(OEParseLogger* from);
 
  protected:
@@ -70,6 +75,8 @@ class OEParseLogger : public OEDynamicArrayParseException {
   static OEParseLogger* ms_theOEParseLogger;
   unsigned short m_enabled = 1;
   unsigned short m_anyLogged = 0;
+  uint32_t m_reportCount = 0;
+  OEParseWarning m_lastReported = OEPW_UNKNOWNEXCEPTION;
   OEBuffer* m_buffer = nullptr;
   OEParser* m_parser = nullptr;
 };
