@@ -7,6 +7,10 @@
 #include "ofxkit/core/OETagDictionary.h"
 #include "ofxkit/types/OEBuffer.h"
 #include "ofxkit/types/OEDynamicArray.h"
+#include "ofxkit/types/OEDataConversion.h"
+#include "ofxkit/types/OEDateTime.h"
+#include "ofxkit/types/OELanguage.h"
+#include "ofxkit/types/OEPrecisionInteger.h"
 #include "ofxkit/types/OEUtility.h"
 
 OEBuilder::OEBuilder(OEBuildStringCrLfOpt option)
@@ -250,6 +254,98 @@ OEBuildStatus OEBuilder::AddTagOEString(OETagID tag, const OEString* value) {
   if (!value) return OE_BUILD_NO_VALUE;
   return AddTagOEString(tag, *value);
 }
+
+OEBuildStatus OEBuilder::AddText(const char* text) {
+  if (!text) return OE_BUILD_BAD_VALUE;
+  OEBuildStatus s = Put(text, static_cast<uint32_t>(strlen(text)));
+  return s != OE_BUILD_OK ? s : PutNewLine();
+}
+
+OEBuildStatus OEBuilder::AddTagOEText(OETagID tag, const char* text) {
+  if (!text) return OE_BUILD_BAD_VALUE;
+  OEBuildStatus s = AddTagElement(tag);
+  return s != OE_BUILD_OK ? s : AddText(text);
+}
+
+OEBuildStatus OEBuilder::AddHeader(OEHeaderTag header, const OEString& value) {
+  if (value.GetStrLength() == 0) return OE_BUILD_OK;
+  const char* name = OEDataConversion::Text(header);
+  if (!name) return OE_BUILD_BAD_VALUE;
+  OEBuildStatus s = Put(name, static_cast<uint32_t>(strlen(name)));
+  if (s == OE_BUILD_OK) s = Put(":", 1);
+  if (s == OE_BUILD_OK) s = Put(value.c_str(), value.GetStrLength());
+  if (s == OE_BUILD_OK) s = PutLineEnd();
+  return s;
+}
+
+OEBuildStatus OEBuilder::AddPrecisionInteger(const OEPrecisionInteger& value) {
+  if (!value.IsValid()) return OE_BUILD_BAD_VALUE;
+  char text[OEPrecisionInteger::kTextSize + 1];
+  if (!value.FormatText(text)) return g_allocFailed ? OE_BUILD_NO_MEMORY : OE_BUILD_BAD_VALUE;
+  return AddText(text);
+}
+
+OEBuildStatus OEBuilder::AddAmount(const OEPrecisionInteger& value) { return AddPrecisionInteger(value); }
+OEBuildStatus OEBuilder::AddQuantity(const OEPrecisionInteger& value) { return AddPrecisionInteger(value); }
+OEBuildStatus OEBuilder::AddUnitPrice(const OEPosPrecisionInteger& value) { return AddPrecisionInteger(value); }
+OEBuildStatus OEBuilder::AddRate(OEPercent value) { return AddPrecisionInteger(value); }
+
+OEBuildStatus OEBuilder::AddDateTime(const OEDateTime& value) {
+  if (!value.GetDateString(m_scratch)) return OE_BUILD_BAD_VALUE;
+  return AddText(m_scratch.c_str());
+}
+
+OEBuildStatus OEBuilder::AddTime(const OETime& value) {
+  if (!value.GetTimeString(m_scratch)) return OE_BUILD_BAD_VALUE;
+  return AddText(m_scratch.c_str());
+}
+
+OEBuildStatus OEBuilder::AddServerID(const OEString12& id) { return AddString(id, OE_MACRO_REPLACE, 1); }
+OEBuildStatus OEBuilder::AddPayeeID(const OEString12& id) { return AddString(id, OE_MACRO_REPLACE, 1); }
+
+OEBuildStatus OEBuilder::AddLanguage(const OELanguage& language) {
+  OEString3 code;
+  if (!OEDataConversion::LanguageToString(language, code)) return OE_BUILD_BAD_VALUE;
+  return AddString(code, OE_MACRO_REPLACE, 1);
+}
+
+// These two write an empty value for a value without a text, and never fail.
+OEBuildStatus OEBuilder::AddFidelityOptBuyType(const OEFidelityOptBuyType& value) {
+  OEString text(OEDataConversion::Text(value));
+  AddString(text, OE_MACRO_REPLACE, 1);
+  return OE_BUILD_OK;
+}
+
+OEBuildStatus OEBuilder::AddFidelityOptSellType(const OEFidelityOptSellType& value) {
+  OEString text(OEDataConversion::Text(value));
+  AddString(text, OE_MACRO_REPLACE, 1);
+  return OE_BUILD_OK;
+}
+
+#define OE_TAG_THEN(Adder, Type)                                       \
+  OEBuildStatus OEBuilder::AddTagOE##Adder(OETagID tag, Type value) {  \
+    OEBuildStatus s = AddTagElement(tag);                              \
+    return s != OE_BUILD_OK ? s : Add##Adder(value);                   \
+  }
+OE_TAG_THEN(Amount, const OEPrecisionInteger&)
+OE_TAG_THEN(Quantity, const OEPrecisionInteger&)
+OE_TAG_THEN(UnitPrice, const OEPosPrecisionInteger&)
+OE_TAG_THEN(Rate, const OEPercent&)
+OE_TAG_THEN(DateTime, const OEDateTime&)
+OE_TAG_THEN(Time, const OETime&)
+OE_TAG_THEN(ServerID, const OEString12&)
+OE_TAG_THEN(PayeeID, const OEString12&)
+OE_TAG_THEN(Language, const OELanguage&)
+#undef OE_TAG_THEN
+
+// Enumerations: the value's text, checked before anything is written.
+#define OE_ENUM_ADDERS(Name, Type)                                                 \
+  OEBuildStatus OEBuilder::Add##Name(Type value) { return AddText(OEDataConversion::Text(value)); } \
+  OEBuildStatus OEBuilder::AddTagOE##Name(OETagID tag, Type value) {               \
+    return AddTagOEText(tag, OEDataConversion::Text(value));                       \
+  }
+OE_BUILDER_ENUMS(OE_ENUM_ADDERS)
+#undef OE_ENUM_ADDERS
 
 OEBuildStatus OEBuilder::AddBuffer(OEBuffer* other) {
   if (!m_output) return OE_BUILD_NO_OUTPUT;

@@ -1,0 +1,559 @@
+// The machinery behind every OFX aggregate class.
+//
+// An aggregate is described once, declaratively:
+//
+//   In its header, a field list and the class body:
+//
+//     #define OE_BANKACCOUNT_FIELDS(X)  X(TEXT, BankID, BANKID, OEString9)
+//         X(TEXT, BranchID, BRANCHID, OEString22)
+//         X(VALUE, AccountType, ACCTTYPE, OEBankAccountType)
+//     (one macro, continued over lines)
+//
+//     class OEBankAccount : public OEBankOrCCAccount {
+//       OE_AGGREGATE(OEBankAccount, OE_BANKACCOUNT_FIELDS)
+//     };
+//
+//   In its source, the tags and rules:
+//
+//     OE_DEFINE_AGGREGATE(OEBankAccount, OEBankOrCCAccount, OE_BANKACCOUNT_FIELDS, BANKACCTFROM,
+//         .Valid(OE_TAGS(BANKID, BRANCHID, ACCTID, ACCTTYPE, ACCTKEY))
+//         .Required(OE_TAGS(BANKID, ACCTID, ACCTTYPE)))
+//
+// Field kinds (X(KIND, Name, TAG, Type)):
+//   TEXT   an OEString subclass; Get<Name>() and Set<Name>(const OEString&).
+//   VALUE  an enumeration, amount, date, time, integer or language (anything
+//          with OEValueTraits); Get<Name>(), Set<Name>(value), Set<Name>(text).
+//   FLAG   a Y/N flag held as unsigned short; Set<Name>(flag), Set<Name>(text).
+//   CHILD  an owned child aggregate; Get<Name>() and Set<Name>(Type*).
+//   ALSO   a further tag for the CHILD field <Name> declared before (an account
+//          that stands as "BANKACCTFROM" or "CCACCTFROM"); declares nothing.
+//   LIST   owned repeated children; GetNum<Name>(), Get<Name>(i),
+//          Set<Name>(i, Type*), Append<Name>(Type*), Clear<Name>().
+//   VALUES a repeated element of a VALUE type; GetNum<Name>(), Get<Name>(i),
+//          Append<Name>(value or text), Set<Name>(i, value or text), Clear<Name>().
+//
+// The description gives: .Valid(tags) in OFX order (the order of the
+// presence bits), .Required(tags), .WriteOrder(tags) when children and
+// elements are written in another order, .OneOf(a, b) for a pair of which at
+// most one may be present and one is expected. A class may inherit fields from
+// a family base; its valid tags choose which of them it uses.
+//
+// From that, OEAggregate supplies parsing (HandleTagElement, HandleTagStart),
+// writing (Build), deep copies, child enumeration, the required checks and the
+// destruction of owned children. Classes that depart from the pattern
+// override those virtual operations by hand.
+#pragma once
+
+#include <cstdint>
+#include <initializer_list>
+#include <type_traits>
+#include <vector>
+
+#include "ofxkit/core/OEBuilder.h"
+#include "ofxkit/core/OEDataObj.h"
+#include "ofxkit/core/OEDataObjFactory.h"
+#include "ofxkit/core/OEPreprocessor.h"
+#include "ofxkit/core/OETagDictionary.h"
+#include "ofxkit/types/OEDataConversion.h"
+#include "ofxkit/types/OEDateTime.h"
+#include "ofxkit/types/OEDynamicArray.h"
+#include "ofxkit/types/OELanguage.h"
+#include "ofxkit/types/OEPrecisionInteger.h"
+
+class OEAggregate;
+
+// ---------------------------------------------------------------------------
+// Value types: how each converts from OFX text and is written.
+
+// Runs a conversion with the log switched off and tells whether it reported a
+// fault, so that a setter can log one warning that names its tag and object.
+class OEQuietConversion {
+ public:
+  OEQuietConversion();
+  ~OEQuietConversion();
+  OEQuietConversion(const OEQuietConversion&) = delete;
+  OEQuietConversion& operator=(const OEQuietConversion&) = delete;
+  // 0 when nothing was reported, else the code of the last fault.
+  OEParseWarning Fault() const;
+  bool Faulted() const;
+
+ private:
+  unsigned short m_wasEnabled;
+  uint32_t m_count;
+};
+
+template <class T, class Enable = void>
+struct OEValueTraits;
+
+// Enumerations of OEDataConversion.
+template <class E>
+struct OEValueTraits<E, std::enable_if_t<std::is_enum<E>::value>> {
+  static bool FromText(const OEString& text, E& value) {
+    int32_t found = OEDataConversion::FindText(text.c_str(), text.GetStrLength(), OEEnumTraits<E>::kFirstMatched,
+                                               OEEnumTraits<E>::kCount - 1, OEEnumTraits<E>::Texts());
+    if (found < 0) return false;
+    value = static_cast<E>(found);
+    return true;
+  }
+  static OEBuildStatus Write(OEBuilder* b, OETagID tag, const E& value) {
+    return b->AddTagOEText(tag, OEDataConversion::Text(value));
+  }
+};
+
+#define OE_VALUE_TRAITS(TYPE, FROM_TEXT, WRITE)                                                     \
+  template <>                                                                                       \
+  struct OEValueTraits<TYPE> {                                                                      \
+    static bool FromText(const OEString& text, TYPE& value) { return FROM_TEXT; }                   \
+    static OEBuildStatus Write(OEBuilder* b, OETagID tag, const TYPE& value) { return WRITE; }      \
+  };
+OE_VALUE_TRAITS(OEPrecisionInteger, value.ConvertStringToOEPrecisionInteger(text.c_str()) != 0,
+                b->AddTagOEAmount(tag, value))
+OE_VALUE_TRAITS(OEPosPrecisionInteger, value.ConvertStringToOEPrecisionInteger(text.c_str()) != 0,
+                b->AddTagOEUnitPrice(tag, value))
+OE_VALUE_TRAITS(OEPercent, value.ConvertStringToOEPrecisionInteger(text.c_str()) != 0, b->AddTagOERate(tag, value))
+OE_VALUE_TRAITS(OEDateTime, value.ConvertStringToOEDateTime(text.c_str()) != 0, b->AddTagOEDateTime(tag, value))
+OE_VALUE_TRAITS(OETime, value.ConvertStringToOETime(text.c_str()) != 0, b->AddTagOETime(tag, value))
+OE_VALUE_TRAITS(unsigned short, OEDataConversion::StringToUShort(text, value) != 0, b->AddTagOEUShort(tag, value))
+OE_VALUE_TRAITS(short, OEDataConversion::StringToSShort(text, value) != 0, b->AddTagOESShort(tag, value))
+OE_VALUE_TRAITS(int32_t, OEDataConversion::StringToSLong(text, value) != 0, b->AddTagOESLong(tag, value))
+OE_VALUE_TRAITS(uint32_t, OEDataConversion::StringToULong(text, value) != 0, b->AddTagOEULong(tag, value))
+OE_VALUE_TRAITS(OELanguage, OEDataConversion::StringToLanguage(text, value) != 0, b->AddTagOELanguage(tag, value))
+#undef OE_VALUE_TRAITS
+
+// The Y/N flags.
+struct OEFlagTraits {
+  static bool FromText(const OEString& text, unsigned short& value) {
+    return OEDataConversion::StringToBoolean(text, value) != 0;
+  }
+  static OEBuildStatus Write(OEBuilder* b, OETagID tag, const unsigned short& value) {
+    return b->AddTagOEBoolean(tag, value);
+  }
+};
+
+// ---------------------------------------------------------------------------
+// Children: how the object for a child tag is made.
+
+// Makes the child of class T for the tag through the factory. Specialised for
+// family bases (accounts) whose concrete class depends on the tag.
+template <class T>
+struct OEChildCreator;
+
+#define OE_CREATOR(creator, cls)                                                           \
+  template <>                                                                              \
+  struct OEChildCreator<cls> {                                                             \
+    static cls* Make(OEDataObjFactory* f, OETagID) { return f->creator(); }                \
+  };
+#define OE_CREATOR_PLAIN(creator, type)
+#include "ofxkit/core/OEFactoryCreators.def"
+#undef OE_CREATOR_PLAIN
+#undef OE_CREATOR
+
+// ---------------------------------------------------------------------------
+// The description of one field under one tag.
+
+enum OEFieldKind : uint8_t { OE_FIELD_ELEMENT, OE_FIELD_CHILD, OE_FIELD_LIST, OE_FIELD_VALUES };
+
+struct OEFieldDesc {
+  OETagID tag;
+  OEFieldKind kind;
+  bool alias;  // another tag for a member described by an earlier entry
+  // Elements: set from text (logging faults) and write when present.
+  unsigned short (*setText)(OEAggregate* self, OETagID tag, const OEString& text);
+  OEBuildStatus (*write)(OEBuilder* b, const OEAggregate* self, OETagID tag);
+  void (*copy)(OEAggregate* dst, const OEAggregate* src);
+  // Children.
+  OEDataObj* (*create)(OEDataObjFactory* f, OETagID tag);
+  unsigned short (*count)(const OEAggregate* self);
+  OEDataObj* (*get)(const OEAggregate* self, unsigned short i);
+  // CHILD: replaces (deleting what was held); LIST: appends. 0 on failure.
+  unsigned short (*put)(OEAggregate* self, OEDataObj* child);
+  // Deletes every child held.
+  void (*reset)(OEAggregate* self);
+  // Identifies the member, so that aliases share it.
+  const void* member;
+};
+
+// Everything the generic code knows of one class.
+class OEAggregateInfo {
+ public:
+  OEAggregateInfo(const OEAggregateInfo* parent, std::initializer_list<OEFieldDesc> fields, OETagID defaultType);
+
+  OEAggregateInfo& Valid(std::initializer_list<OETagID> tags);
+  OEAggregateInfo& Required(std::initializer_list<OETagID> tags);
+  OEAggregateInfo& WriteOrder(std::initializer_list<OETagID> tags);
+  OEAggregateInfo& OneOf(OETagID first, OETagID second);
+
+  // Fills in the per-position lookup; called once when the info is complete.
+  const OEAggregateInfo& Finish();
+
+  const OEAggregateInfo* parent;
+  std::vector<OEFieldDesc> fields;  // declared by this class itself
+  OETagID defaultType;
+  std::vector<OETagID> valid;
+  std::vector<OETagID> required;
+  std::vector<OETagID> order;  // empty: the valid order
+  struct Pair {
+    OETagID first, second;
+  };
+  std::vector<Pair> oneOf;
+  // Per valid position: the field that takes the tag (null for none), and
+  // whether that position writes the member (its first tag in write order).
+  std::vector<const OEFieldDesc*> byPosition;
+  std::vector<const OEFieldDesc*> writeList;  // in write order, one per member to write
+  std::vector<OETagID> writeTags;
+  std::vector<const OEFieldDesc*> children;  // child members in valid order, once each
+  std::vector<const OEFieldDesc*> members;   // every member of the class chain, once each
+
+ private:
+  const OEFieldDesc* FindField(OETagID tag) const;
+};
+
+// ---------------------------------------------------------------------------
+
+class OEAggregate : public OEDataObj {
+ public:
+  OEAggregate() = default;
+  OEAggregate(const OEAggregate&) = delete;
+  OEAggregate& operator=(const OEAggregate&) = delete;
+  ~OEAggregate() override = default;
+
+  static const OEAggregateInfo& ClassInfo();
+  virtual const OEAggregateInfo& GetInfo() const { return ClassInfo(); }
+
+  OEParseStatus HandleTagStart(const OETagDictionaryEntry* const entry) override;
+  using OEDataObj::HandleTagElement;
+  OEParseStatus HandleTagElement(const OETagDictionaryEntry* const entry, const OEString& value) override;
+  unsigned short GetArrayOfValidTags(OEArrayOfTags& tags) const override;
+  unsigned short GetArrayOfRequiredTags(OEArrayOfTags& tags) const override;
+  OEBuildStatus Build(OEBuilder* builder) const override;
+  unsigned short AllRequiredPresent() override;
+  OETagID GetFirstMissingRequiredTag(OETagID after) const override;
+  OEDataObj* GetChild(unsigned short index) const override;
+  unsigned short GetNumberOfChildren() const override;
+
+  // Copies every field of source, which must be of this object's class;
+  // children are copied deeply through the factory. 1 on success.
+  virtual unsigned short CopyAggregateFrom(const OEAggregate* source);
+
+  // Sets the value of an element from OFX text, as a parser would.
+  unsigned short SetElementText(OETagID tag, const OEString& text);
+
+  // Logs a value that did not fit or convert, naming this object and the tag.
+  void LogFieldFault(OEParseWarning warning, OETagID tag, const OEString& text);
+  // Clears a presence bit without the warning ClearTag gives for unknown tags.
+  void ClearTagQuietly(OETagID tag);
+
+ protected:
+  // Deletes the children held by the fields this class declares itself.
+  void DestroyOwnFields(const OEAggregateInfo& info);
+
+ private:
+  const OEFieldDesc* FieldAt(OETagID tag) const;
+};
+
+// ---------------------------------------------------------------------------
+// Setter bodies shared by the generated accessors.
+
+// A text element: kept whole; an empty text answers 3 and changes no bit; an
+// over-long text is logged (OEPW_TOOLONG) and still marked present.
+unsigned short OESetTextField(OEAggregate* self, OEString& field, OETagID tag, const OEString& text);
+
+template <class T>
+unsigned short OESetValueField(OEAggregate* self, T& field, OETagID tag, const T& value) {
+  field = value;
+  return self->SetTag(tag);
+}
+
+// A typed element from text: converted quietly; a fault logs one warning
+// (the conversion's code, the text, the tag, the object) and leaves the field
+// and its presence bit as they were.
+template <class Traits, class T>
+unsigned short OESetFromText(OEAggregate* self, T& field, OETagID tag, const OEString& text) {
+  T converted = field;
+  OEParseWarning fault;
+  {
+    OEQuietConversion quiet;
+    bool ok = Traits::FromText(text, converted);
+    fault = quiet.Faulted() ? quiet.Fault() : (ok ? OEPW_UNKNOWNEXCEPTION : OEPW_BADFORMAT);
+  }
+  if (fault != OEPW_UNKNOWNEXCEPTION) {
+    self->LogFieldFault(fault, tag, text);
+    return 0;
+  }
+  field = converted;
+  return self->SetTag(tag);
+}
+
+// A single child: refused (0) while one is held; otherwise owned from now on,
+// and the tag that is the child's own type is marked present.
+template <class T>
+unsigned short OESetChildField(OEAggregate* self, T*& field, T* child) {
+  if (field || !child) return 0;
+  field = child;
+  return self->SetTag(child->GetType());
+}
+
+// A repeated child at i (i = count appends); its type's tag is marked present.
+template <class T>
+unsigned short OESetListElement(OEAggregate* self, OEDynamicArrayTyped<T>& list, unsigned short i, T* child) {
+  if (!child || i > list.Entries()) return 0;
+  if (!list.Set(i, child)) return 0;
+  self->SetTag(child->GetType());
+  return 1;
+}
+
+template <class T>
+unsigned short OESetValuesElement(OEAggregate* self, OEDynamicArrayTyped<T>& list, unsigned short i, OETagID tag,
+                                  const T& value) {
+  if (i > list.Entries() || !list.SetVal(i, value)) return 0;
+  return self->SetTag(tag);
+}
+
+template <class Traits, class T>
+unsigned short OESetValuesText(OEAggregate* self, OEDynamicArrayTyped<T>& list, unsigned short i, OETagID tag,
+                               const OEString& text) {
+  T value{};
+  OEParseWarning fault;
+  {
+    OEQuietConversion quiet;
+    bool ok = Traits::FromText(text, value);
+    fault = quiet.Faulted() ? quiet.Fault() : (ok ? OEPW_UNKNOWNEXCEPTION : OEPW_BADFORMAT);
+  }
+  if (fault != OEPW_UNKNOWNEXCEPTION) {
+    self->LogFieldFault(fault, tag, text);
+    return 0;
+  }
+  return OESetValuesElement(self, list, i, tag, value);
+}
+
+template <class T>
+void OEClearList(OEAggregate* self, OEDynamicArrayTyped<T>& list, OETagID tag) {
+  list.DeleteAll();
+  self->ClearTagQuietly(tag);
+}
+
+// ---------------------------------------------------------------------------
+// Generic field operations, instantiated per member.
+
+template <class C, class T, T C::*M, class Traits>
+struct OEElementOps {
+  static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text);
+  static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
+    return Traits::Write(b, tag, static_cast<const C*>(self)->*M);
+  }
+  static void Copy(OEAggregate* dst, const OEAggregate* src) { static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M; }
+};
+
+struct OETextTraits {
+  static OEBuildStatus Write(OEBuilder* b, OETagID tag, const OEString& value) { return b->AddTagOEString(tag, value); }
+};
+
+template <class C, class T, T C::*M, class Traits>
+unsigned short OEElementOps<C, T, M, Traits>::SetText(OEAggregate* self, OETagID tag, const OEString& text) {
+  T& field = static_cast<C*>(self)->*M;
+  if constexpr (std::is_same<Traits, OETextTraits>::value)
+    return OESetTextField(self, field, tag, text);
+  else
+    return OESetFromText<Traits>(self, field, tag, text);
+}
+
+template <class C, class T, T* C::*M>
+struct OEChildOps {
+  static T*& Ref(OEAggregate* self) { return static_cast<C*>(self)->*M; }
+  static T* Ref(const OEAggregate* self) { return static_cast<const C*>(self)->*M; }
+  static OEDataObj* Create(OEDataObjFactory* f, OETagID tag) { return OEChildCreator<T>::Make(f, tag); }
+  static unsigned short Count(const OEAggregate* self) { return Ref(self) ? 1 : 0; }
+  static OEDataObj* Get(const OEAggregate* self, unsigned short i) { return i == 0 ? Ref(self) : nullptr; }
+  static unsigned short Put(OEAggregate* self, OEDataObj* child) {
+    T*& field = Ref(self);
+    if (field != child) delete field;
+    field = static_cast<T*>(child);
+    return 1;
+  }
+  static void Reset(OEAggregate* self) {
+    T*& field = Ref(self);
+    delete field;
+    field = nullptr;
+  }
+};
+
+template <class C, class T, OEDynamicArrayTyped<T> C::*M>
+struct OEListOps {
+  static OEDynamicArrayTyped<T>& Ref(OEAggregate* self) { return static_cast<C*>(self)->*M; }
+  static const OEDynamicArrayTyped<T>& Ref(const OEAggregate* self) { return static_cast<const C*>(self)->*M; }
+  static OEDataObj* Create(OEDataObjFactory* f, OETagID tag) { return OEChildCreator<T>::Make(f, tag); }
+  static unsigned short Count(const OEAggregate* self) { return Ref(self).Entries(); }
+  static OEDataObj* Get(const OEAggregate* self, unsigned short i) { return Ref(self).Get(i); }
+  static unsigned short Put(OEAggregate* self, OEDataObj* child) {
+    return Ref(self).Append(static_cast<T*>(child));
+  }
+  static void Reset(OEAggregate* self) { Ref(self).DeleteAll(); }
+};
+
+template <class C, class T, OEDynamicArrayTyped<T> C::*M, class Traits>
+struct OEValuesOps {
+  static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {
+    OEDynamicArrayTyped<T>& list = static_cast<C*>(self)->*M;
+    return OESetValuesText<Traits>(self, list, list.Entries(), tag, text);
+  }
+  static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
+    const OEDynamicArrayTyped<T>& list = static_cast<const C*>(self)->*M;
+    for (unsigned short i = 0; i < list.Entries(); ++i) {
+      const T* value = list.Get(i);
+      if (!value) continue;
+      OEBuildStatus s = Traits::Write(b, tag, *value);
+      if (s != OE_BUILD_OK) return s;
+    }
+    return OE_BUILD_OK;
+  }
+  static void Copy(OEAggregate* dst, const OEAggregate* src) {
+    OEDynamicArrayTyped<T>& to = static_cast<C*>(dst)->*M;
+    const OEDynamicArrayTyped<T>& from = static_cast<const C*>(src)->*M;
+    to.DeleteAll();
+    for (unsigned short i = 0; i < from.Entries(); ++i)
+      if (const T* v = from.Get(i)) to.SetVal(i, *v);
+  }
+};
+
+// ---------------------------------------------------------------------------
+// Declaration macros (class body).
+
+#define OE_FIELD_DECLARE(KIND, Name, TAG, Type) OE_DECLARE_##KIND(Name, TAG, Type)
+
+#define OE_DECLARE_TEXT(Name, TAG, Type)                                                      \
+ public:                                                                                      \
+  const Type& Get##Name() const { return m_##Name; }                                          \
+  unsigned short Set##Name(const OEString& text) { return OESetTextField(this, m_##Name, OE_TAG_##TAG, text); } \
+                                                                                              \
+ protected:                                                                                   \
+  Type m_##Name;
+
+#define OE_DECLARE_VALUE(Name, TAG, Type)                                                     \
+ public:                                                                                      \
+  const Type& Get##Name() const { return m_##Name; }                                          \
+  unsigned short Set##Name(const Type& value) { return OESetValueField(this, m_##Name, OE_TAG_##TAG, value); } \
+  unsigned short Set##Name(const OEString& text) {                                            \
+    return OESetFromText<OEValueTraits<Type>>(this, m_##Name, OE_TAG_##TAG, text);                    \
+  }                                                                                           \
+                                                                                              \
+ protected:                                                                                   \
+  Type m_##Name{};
+
+#define OE_DECLARE_FLAG(Name, TAG, Type)                                                      \
+ public:                                                                                      \
+  unsigned short Get##Name() const { return m_##Name; }                                       \
+  unsigned short Set##Name(unsigned short flag) {                                             \
+    return OESetValueField(this, m_##Name, OE_TAG_##TAG, static_cast<unsigned short>(flag ? 1 : 0)); \
+  }                                                                                           \
+  unsigned short Set##Name(const OEString& text) { return OESetFromText<OEFlagTraits>(this, m_##Name, OE_TAG_##TAG, text); } \
+                                                                                              \
+ protected:                                                                                   \
+  unsigned short m_##Name = 0;
+
+#define OE_DECLARE_CHILD(Name, TAG, Type)                                \
+ public:                                                                 \
+  Type* Get##Name() const { return m_##Name; }                           \
+  unsigned short Set##Name(Type* child) { return OESetChildField(this, m_##Name, child); } \
+                                                                         \
+ protected:                                                              \
+  Type* m_##Name = nullptr;
+
+#define OE_DECLARE_ALSO(Name, TAG, Type)
+
+#define OE_DECLARE_LIST(Name, TAG, Type)                                                          \
+ public:                                                                                          \
+  unsigned short GetNum##Name() const { return m_##Name.Entries(); }                              \
+  Type* Get##Name(unsigned short i) const { return m_##Name.Get(i); }                             \
+  unsigned short Set##Name(unsigned short i, Type* child) { return OESetListElement(this, m_##Name, i, child); } \
+  unsigned short Append##Name(Type* child) { return OESetListElement(this, m_##Name, m_##Name.Entries(), child); } \
+  void Clear##Name() { OEClearList(this, m_##Name, OE_TAG_##TAG); }                                       \
+                                                                                                  \
+ protected:                                                                                       \
+  OEDynamicArrayTyped<Type> m_##Name;
+
+#define OE_DECLARE_VALUES(Name, TAG, Type)                                                        \
+ public:                                                                                          \
+  unsigned short GetNum##Name() const { return m_##Name.Entries(); }                              \
+  const Type* Get##Name(unsigned short i) const { return m_##Name.Get(i); }                       \
+  unsigned short Set##Name(unsigned short i, const Type& value) {                                 \
+    return OESetValuesElement(this, m_##Name, i, OE_TAG_##TAG, value);                           \
+  }                                                                                               \
+  unsigned short Set##Name(unsigned short i, const OEString& text) {                              \
+    return OESetValuesText<OEValueTraits<Type>>(this, m_##Name, i, OE_TAG_##TAG, text);           \
+  }                                                                                               \
+  unsigned short Append##Name(const Type& value) { return Set##Name(m_##Name.Entries(), value); } \
+  unsigned short Append##Name(const OEString& text) { return Set##Name(m_##Name.Entries(), text); } \
+  void Clear##Name() { OEClearList(this, m_##Name, OE_TAG_##TAG); }                                       \
+                                                                                                  \
+ protected:                                                                                       \
+  OEDynamicArrayTyped<Type> m_##Name;
+
+// The class body of an aggregate: construction, destruction, its description
+// and DeepCopyFrom, then the fields of FIELDS.
+#define OE_AGGREGATE(Class, FIELDS)                                            \
+ public:                                                                       \
+  Class();                                                                     \
+  ~Class() override;                                                           \
+  static const OEAggregateInfo& ClassInfo();                                   \
+  const OEAggregateInfo& GetInfo() const override { return ClassInfo(); }      \
+  unsigned short DeepCopyFrom(const Class* source) { return CopyAggregateFrom(source); } \
+  FIELDS(OE_FIELD_DECLARE)                                                     \
+ public:
+
+// A field list with no fields.
+#define OE_NO_FIELDS(X)
+
+// ---------------------------------------------------------------------------
+// Definition macros (source file).
+
+#define OE_TAG_PREFIX(name) OE_TAG_##name
+// A list of tag names: OE_TAGS(BANKID, ACCTID) is {OE_TAG_BANKID, OE_TAG_ACCTID}.
+#define OE_TAGS(...) {OE_PP_FOR_EACH(OE_TAG_PREFIX, __VA_ARGS__)}
+#define OE_NO_TAGS {}
+
+#define OE_FIELD_DESC(KIND, Name, TAG, Type) OE_DESC_##KIND(Name, TAG, Type)
+#define OE_DESC_ELEMENT_(Name, TAG, Type, Traits)                                                        \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_ELEMENT, false,                                                     \
+              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::SetText,                    \
+              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Write,                      \
+              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Copy,                       \
+              nullptr, nullptr, nullptr, nullptr, nullptr, #Name},
+#define OE_DESC_TEXT(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OETextTraits)
+#define OE_DESC_VALUE(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OEValueTraits<Type>)
+#define OE_DESC_FLAG(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, unsigned short, OEFlagTraits)
+#define OE_DESC_CHILD_(Name, TAG, Type, alias)                                                           \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_CHILD, alias, nullptr, nullptr, nullptr,                           \
+              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                               \
+              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
+              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
+              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                  \
+              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+#define OE_DESC_CHILD(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, false)
+#define OE_DESC_ALSO(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, true)
+#define OE_DESC_LIST(Name, TAG, Type)                                                                    \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, false, nullptr, nullptr, nullptr,                            \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+#define OE_DESC_VALUES(Name, TAG, Type)                                                                  \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_VALUES, false,                                                     \
+              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::SetText,        \
+              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Write,          \
+              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Copy,           \
+              nullptr, nullptr, nullptr, nullptr, nullptr, #Name},
+
+// Defines construction (setting the default type), destruction and the class
+// description. DESCRIPTION continues the description: .Valid(...) and so on.
+#define OE_DEFINE_AGGREGATE(Class, Base, FIELDS, DEFAULT_TYPE, DESCRIPTION)                  \
+  Class::Class() { SetType(OE_TAG_##DEFAULT_TYPE); }                                         \
+  Class::~Class() { DestroyOwnFields(ClassInfo()); }                                         \
+  const OEAggregateInfo& Class::ClassInfo() {                                                \
+    using ThisClass [[maybe_unused]] = Class;                                                \
+    static OEAggregateInfo info =                                                            \
+        OEAggregateInfo(&Base::ClassInfo(), {FIELDS(OE_FIELD_DESC)}, OE_TAG_##DEFAULT_TYPE)  \
+            DESCRIPTION;                                                                     \
+    static const OEAggregateInfo& finished = info.Finish();                                  \
+    return finished;                                                                         \
+  }

@@ -1,0 +1,288 @@
+#include "ofxkit/core/OEAggregate.h"
+
+#include <cstring>
+
+#include "ofxkit/parse/OEParseLogger.h"
+
+// ---------------------------------------------------------------------------
+
+OEQuietConversion::OEQuietConversion() : m_wasEnabled(0), m_count(0) {
+  if (OEParseLogger* log = OEParseLogger::TheOEParseLogger()) {
+    m_wasEnabled = log->GetLoggingEnabled();
+    m_count = log->GetReportCount();
+    log->EnableLogging(0);
+  }
+}
+
+OEQuietConversion::~OEQuietConversion() {
+  if (OEParseLogger* log = OEParseLogger::TheOEParseLogger()) log->EnableLogging(m_wasEnabled);
+}
+
+bool OEQuietConversion::Faulted() const {
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  return log && log->GetReportCount() != m_count;
+}
+
+OEParseWarning OEQuietConversion::Fault() const {
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  return Faulted() ? log->GetLastReported() : OEPW_UNKNOWNEXCEPTION;
+}
+
+// ---------------------------------------------------------------------------
+
+OEAggregateInfo::OEAggregateInfo(const OEAggregateInfo* parentInfo, std::initializer_list<OEFieldDesc> ownFields,
+                                 OETagID type)
+    : parent(parentInfo), fields(ownFields), defaultType(type) {}
+
+OEAggregateInfo& OEAggregateInfo::Valid(std::initializer_list<OETagID> tags) {
+  valid.assign(tags);
+  return *this;
+}
+
+OEAggregateInfo& OEAggregateInfo::Required(std::initializer_list<OETagID> tags) {
+  required.assign(tags);
+  return *this;
+}
+
+OEAggregateInfo& OEAggregateInfo::WriteOrder(std::initializer_list<OETagID> tags) {
+  order.assign(tags);
+  return *this;
+}
+
+OEAggregateInfo& OEAggregateInfo::OneOf(OETagID first, OETagID second) {
+  oneOf.push_back(Pair{first, second});
+  return *this;
+}
+
+const OEFieldDesc* OEAggregateInfo::FindField(OETagID tag) const {
+  for (const OEAggregateInfo* info = this; info; info = info->parent)
+    for (const OEFieldDesc& d : info->fields)
+      if (d.tag == tag) return &d;
+  return nullptr;
+}
+
+namespace {
+bool SameMember(const OEFieldDesc* a, const OEFieldDesc* b) {
+  return a->kind == b->kind && strcmp(static_cast<const char*>(a->member), static_cast<const char*>(b->member)) == 0;
+}
+
+bool Contains(const std::vector<const OEFieldDesc*>& list, const OEFieldDesc* d) {
+  for (const OEFieldDesc* x : list)
+    if (SameMember(x, d)) return true;
+  return false;
+}
+
+bool IsChildKind(const OEFieldDesc* d) { return d->kind == OE_FIELD_CHILD || d->kind == OE_FIELD_LIST; }
+}  // namespace
+
+const OEAggregateInfo& OEAggregateInfo::Finish() {
+  byPosition.clear();
+  for (OETagID tag : valid) byPosition.push_back(FindField(tag));
+
+  const std::vector<OETagID>& writing = order.empty() ? valid : order;
+  for (OETagID tag : writing) {
+    const OEFieldDesc* d = FindField(tag);
+    if (!d) continue;
+    if (IsChildKind(d) && Contains(writeList, d)) continue;  // a child is written once, under its own type
+    writeList.push_back(d);
+    writeTags.push_back(tag);
+  }
+  for (const OEFieldDesc* d : byPosition)
+    if (d && IsChildKind(d) && !Contains(children, d)) children.push_back(d);
+  for (const OEAggregateInfo* info = this; info; info = info->parent)
+    for (const OEFieldDesc& d : info->fields)
+      if (!d.alias && !Contains(members, &d)) members.push_back(&d);
+  return *this;
+}
+
+// ---------------------------------------------------------------------------
+
+const OEAggregateInfo& OEAggregate::ClassInfo() {
+  static OEAggregateInfo info(nullptr, {}, OE_TAG_NONE);
+  static const OEAggregateInfo& finished = info.Finish();
+  return finished;
+}
+
+const OEFieldDesc* OEAggregate::FieldAt(OETagID tag) const {
+  int32_t position = ValidTagPosition(tag);
+  if (position < 0) return nullptr;
+  const OEAggregateInfo& info = GetInfo();
+  return static_cast<size_t>(position) < info.byPosition.size() ? info.byPosition[position] : nullptr;
+}
+
+unsigned short OEAggregate::GetArrayOfValidTags(OEArrayOfTags& tags) const {
+  const OEAggregateInfo& info = GetInfo();
+  tags.tags = info.valid.empty() ? nullptr : info.valid.data();
+  tags.count = static_cast<unsigned short>(info.valid.size());
+  return 1;
+}
+
+unsigned short OEAggregate::GetArrayOfRequiredTags(OEArrayOfTags& tags) const {
+  const OEAggregateInfo& info = GetInfo();
+  tags.tags = info.required.empty() ? nullptr : info.required.data();
+  tags.count = static_cast<unsigned short>(info.required.size());
+  return 1;
+}
+
+OEParseStatus OEAggregate::HandleTagElement(const OETagDictionaryEntry* const entry, const OEString& value) {
+  if (!entry) return OE_PARSE_NOT_HANDLED;
+  const OEFieldDesc* d = FieldAt(entry->id);
+  if (!d || !d->setText) return OE_PARSE_NOT_HANDLED;
+  d->setText(this, entry->id, value);  // the setter logs whatever did not fit
+  return OE_PARSE_OK;
+}
+
+unsigned short OEAggregate::SetElementText(OETagID tag, const OEString& text) {
+  const OEFieldDesc* d = FieldAt(tag);
+  return (d && d->setText) ? d->setText(this, tag, text) : 0;
+}
+
+OEParseStatus OEAggregate::HandleTagStart(const OETagDictionaryEntry* const entry) {
+  if (!entry) return OE_PARSE_NOT_HANDLED;
+  const OEFieldDesc* d = FieldAt(entry->id);
+  if (!d || !d->create) return OE_PARSE_NOT_HANDLED;
+  OEDataObjFactory* factory = GetFactory();
+  if (!factory) return OE_PARSE_NO_PARSER;
+  OEDataObj* child = d->create(factory, entry->id);
+  if (!child) {
+    g_allocFailed = 1;
+    return OE_PARSE_NO_PARSER;
+  }
+  if (!d->put(this, child)) {
+    delete child;
+    return OE_PARSE_NO_PARSER;
+  }
+  return PushAndSetObject(child, entry->id);
+}
+
+OEBuildStatus OEAggregate::Build(OEBuilder* builder) const {
+  if (!builder) return OE_BUILD_NO_OUTPUT;
+  const OEAggregateInfo& info = GetInfo();
+  for (size_t i = 0; i < info.writeList.size(); ++i) {
+    const OEFieldDesc* d = info.writeList[i];
+    OETagID tag = info.writeTags[i];
+    OEBuildStatus status = OE_BUILD_OK;
+    if (d->write) {
+      if (!ValidateTag(tag)) continue;
+      status = d->write(builder, this, tag);
+    } else {
+      unsigned short n = d->count(this);
+      for (unsigned short k = 0; k < n && status == OE_BUILD_OK; ++k)
+        if (const OEDataObj* child = d->get(this, k)) status = child->BuildObject(builder, OE_TAG_NONE);
+    }
+    if (status != OE_BUILD_OK) {
+      builder->SetObjectInError(const_cast<OEAggregate*>(this));
+      return status;
+    }
+  }
+  return OE_BUILD_OK;
+}
+
+unsigned short OEAggregate::AllRequiredPresent() {
+  if (!OEDataObj::AllRequiredPresent()) return 0;
+  for (const OEAggregateInfo::Pair& pair : GetInfo().oneOf)
+    if (ValidateTag(pair.first) && ValidateTag(pair.second)) return 0;
+  return 1;
+}
+
+// The missing tags are the absent required tags in order, then, for each
+// pair of which neither is present, the first of the pair. Each answer is
+// the missing tag that follows `after` in that sequence.
+OETagID OEAggregate::GetFirstMissingRequiredTag(OETagID after) const {
+  OETagID answer = OEDataObj::GetFirstMissingRequiredTag(after);
+  if (answer != OE_TAG_NONE) return answer;
+  bool passed = after == OE_TAG_NONE;
+  if (!passed) {
+    // `after` may itself be the last absent required tag: then the pairs follow.
+    OEArrayOfTags required{nullptr, 0};
+    GetArrayOfRequiredTags(required);
+    for (unsigned short i = 0; i < required.count; ++i)
+      if (required.tags[i] == after && !ValidateTag(after)) passed = true;
+  }
+  for (const OEAggregateInfo::Pair& pair : GetInfo().oneOf) {
+    if (ValidateTag(pair.first) || ValidateTag(pair.second)) continue;
+    if (passed) return pair.first;
+    if (pair.first == after) passed = true;
+  }
+  return OE_TAG_NONE;
+}
+
+unsigned short OEAggregate::GetNumberOfChildren() const {
+  unsigned int n = 0;
+  for (const OEFieldDesc* d : GetInfo().children) n += d->count(this);
+  return static_cast<unsigned short>(n > 0xFFFF ? 0xFFFF : n);
+}
+
+OEDataObj* OEAggregate::GetChild(unsigned short index) const {
+  for (const OEFieldDesc* d : GetInfo().children) {
+    unsigned short n = d->count(this);
+    if (index < n) return d->get(this, index);
+    index = static_cast<unsigned short>(index - n);
+  }
+  return nullptr;
+}
+
+unsigned short OEAggregate::CopyAggregateFrom(const OEAggregate* source) {
+  if (!source) return 0;
+  if (source == this) return 1;
+  const OEAggregateInfo& info = GetInfo();
+  if (&source->GetInfo() != &info) return 0;
+  unsigned short result = 1;
+  OEDataObjFactory* factory = nullptr;
+  for (const OEFieldDesc* d : info.members) {
+    if (d->copy) {
+      d->copy(this, source);
+      continue;
+    }
+    // Children: drop ours, then copy each of the source's deeply.
+    if (d->kind == OE_FIELD_CHILD && d->get(this, 0)) ClearTagQuietly(d->get(this, 0)->GetType());
+    d->reset(this);
+    unsigned short n = d->count(source);
+    for (unsigned short k = 0; k < n; ++k) {
+      const OEAggregate* from = dynamic_cast<const OEAggregate*>(d->get(source, k));
+      if (!from) continue;
+      if (!factory && !(factory = GetFactory())) return 0;
+      OEDataObj* made = d->create(factory, from->GetType());
+      OEAggregate* copy = dynamic_cast<OEAggregate*>(made);
+      if (!copy) {
+        if (!made) g_allocFailed = 1;
+        delete made;
+        result = 0;
+        continue;
+      }
+      if (!copy->CopyAggregateFrom(from) || !d->put(this, copy)) {
+        delete copy;
+        result = 0;
+      }
+    }
+  }
+  CopyBaseMembersFrom(source);
+  return result;
+}
+
+void OEAggregate::LogFieldFault(OEParseWarning warning, OETagID tag, const OEString& text) {
+  OELogWarning(warning, text, OEString(), tag, this);
+}
+
+void OEAggregate::ClearTagQuietly(OETagID tag) {
+  int32_t position = ValidTagPosition(tag);
+  if (position >= 0) ClearPresenceBit(position);
+}
+
+void OEAggregate::DestroyOwnFields(const OEAggregateInfo& info) {
+  for (const OEFieldDesc& d : info.fields)
+    if (d.reset && !d.alias) d.reset(this);
+}
+
+unsigned short OESetTextField(OEAggregate* self, OEString& field, OETagID tag, const OEString& text) {
+  field = text;
+  if (field.IsNull()) return 3;
+  if (field.ExceedsSpecLength()) {
+    // A password's text never reaches the log.
+    if (dynamic_cast<OEUserPassword*>(&field))
+      self->LogFieldFault(OEPW_TOOLONG, tag, OEString("Password too long"));
+    else
+      self->LogFieldFault(OEPW_TOOLONG, tag, text);
+  }
+  return self->SetTag(tag);
+}
