@@ -23,3 +23,7 @@
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/parse/OEParser.h"
+#include "ofxkit/parse/OEParseEngine.h"
+#include "ofxkit/parse/OESimpleParser.h"
+
+#include "ofxkit/envelope/OETransBase.h"

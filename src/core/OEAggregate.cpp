@@ -1,5 +1,6 @@
 #include "ofxkit/core/OEAggregate.h"
 
+#include <cstdio>
 #include <cstring>
 
 #include "ofxkit/parse/OEParseLogger.h"
@@ -26,6 +27,26 @@ bool OEQuietConversion::Faulted() const {
 OEParseWarning OEQuietConversion::Fault() const {
   OEParseLogger* log = OEParseLogger::TheOEParseLogger();
   return Faulted() ? log->GetLastReported() : OEPW_UNKNOWNEXCEPTION;
+}
+
+// ---------------------------------------------------------------------------
+
+unsigned short OEValueText(const OEPrecisionInteger& value, OEString& out) {
+  char text[OEPrecisionInteger::kTextSize + 1];
+  if (!value.IsValid() || !value.FormatText(text)) return 0;
+  out = text;
+  return 1;
+}
+unsigned short OEValueText(const OEDateTime& value, OEString& out) { return value.GetDateString(out); }
+unsigned short OEValueText(const OETime& value, OEString& out) { return value.GetTimeString(out); }
+unsigned short OEValueText(const OELanguage& value, OEString& out) {
+  return OEDataConversion::LanguageToString(value, out);
+}
+unsigned short OEValueText(int64_t value, OEString& out) {
+  char text[24];
+  snprintf(text, sizeof text, "%lld", static_cast<long long>(value));
+  out = text;
+  return 1;
 }
 
 // ---------------------------------------------------------------------------

@@ -98,13 +98,27 @@ struct OEValueTraits<E, std::enable_if_t<std::is_enum<E>::value>> {
   static OEBuildStatus Write(OEBuilder* b, OETagID tag, const E& value) {
     return b->AddTagOEText(tag, OEDataConversion::Text(value));
   }
+  static unsigned short ToText(const E& value, OEString& out) {
+    const char* text = OEDataConversion::Text(value);
+    out = text;
+    return text != nullptr;
+  }
 };
+
+// The OFX text of a typed value, for display and export (not for writing
+// OFX, which the builder does): 1 when the value has one.
+unsigned short OEValueText(const OEPrecisionInteger& value, OEString& out);
+unsigned short OEValueText(const OEDateTime& value, OEString& out);
+unsigned short OEValueText(const OETime& value, OEString& out);
+unsigned short OEValueText(const OELanguage& value, OEString& out);
+unsigned short OEValueText(int64_t value, OEString& out);
 
 #define OE_VALUE_TRAITS(TYPE, FROM_TEXT, WRITE)                                                     \
   template <>                                                                                       \
   struct OEValueTraits<TYPE> {                                                                      \
     static bool FromText(const OEString& text, TYPE& value) { return FROM_TEXT; }                   \
     static OEBuildStatus Write(OEBuilder* b, OETagID tag, const TYPE& value) { return WRITE; }      \
+    static unsigned short ToText(const TYPE& value, OEString& out) { return OEValueText(value, out); } \
   };
 OE_VALUE_TRAITS(OEPrecisionInteger, value.ConvertStringToOEPrecisionInteger(text.c_str()) != 0,
                 b->AddTagOEAmount(tag, value))
@@ -127,6 +141,10 @@ struct OEFlagTraits {
   }
   static OEBuildStatus Write(OEBuilder* b, OETagID tag, const unsigned short& value) {
     return b->AddTagOEBoolean(tag, value);
+  }
+  static unsigned short ToText(const unsigned short& value, OEString& out) {
+    out = value ? "Y" : "N";
+    return 1;
   }
 };
 
@@ -161,6 +179,8 @@ struct OEFieldDesc {
   unsigned short (*setText)(OEAggregate* self, OETagID tag, const OEString& text);
   OEBuildStatus (*write)(OEBuilder* b, const OEAggregate* self, OETagID tag);
   void (*copy)(OEAggregate* dst, const OEAggregate* src);
+  // The text of value i (0 for a single element), for display.
+  unsigned short (*text)(const OEAggregate* self, unsigned short i, OEString& out);
   // Children.
   OEDataObj* (*create)(OEDataObjFactory* f, OETagID tag);
   unsigned short (*count)(const OEAggregate* self);
@@ -342,10 +362,17 @@ struct OEElementOps {
     return Traits::Write(b, tag, static_cast<const C*>(self)->*M);
   }
   static void Copy(OEAggregate* dst, const OEAggregate* src) { static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M; }
+  static unsigned short Text(const OEAggregate* self, unsigned short, OEString& out) {
+    return Traits::ToText(static_cast<const C*>(self)->*M, out);
+  }
 };
 
 struct OETextTraits {
   static OEBuildStatus Write(OEBuilder* b, OETagID tag, const OEString& value) { return b->AddTagOEString(tag, value); }
+  static unsigned short ToText(const OEString& value, OEString& out) {
+    out = value;
+    return 1;
+  }
 };
 
 template <class C, class T, T C::*M, class Traits>
@@ -412,6 +439,11 @@ struct OEValuesOps {
     to.DeleteAll();
     for (unsigned short i = 0; i < from.Entries(); ++i)
       if (const T* v = from.Get(i)) to.SetVal(i, *v);
+  }
+  static unsigned short Count(const OEAggregate* self) { return (static_cast<const C*>(self)->*M).Entries(); }
+  static unsigned short Text(const OEAggregate* self, unsigned short i, OEString& out) {
+    const T* value = (static_cast<const C*>(self)->*M).Get(i);
+    return value ? Traits::ToText(*value, out) : 0;
   }
 };
 
@@ -517,12 +549,13 @@ struct OEValuesOps {
               &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::SetText,                    \
               &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Write,                      \
               &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Copy,                       \
+              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Text,                       \
               nullptr, nullptr, nullptr, nullptr, nullptr, #Name},
 #define OE_DESC_TEXT(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OETextTraits)
 #define OE_DESC_VALUE(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OEValueTraits<Type>)
 #define OE_DESC_FLAG(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, unsigned short, OEFlagTraits)
 #define OE_DESC_CHILD_(Name, TAG, Type, alias)                                                           \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_CHILD, alias, nullptr, nullptr, nullptr,                           \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_CHILD, alias, nullptr, nullptr, nullptr, nullptr,                  \
               &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                               \
               &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
               &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
@@ -531,7 +564,7 @@ struct OEValuesOps {
 #define OE_DESC_CHILD(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, false)
 #define OE_DESC_ALSO(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, true)
 #define OE_DESC_LIST(Name, TAG, Type)                                                                    \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, false, nullptr, nullptr, nullptr,                            \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, false, nullptr, nullptr, nullptr, nullptr,                   \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
@@ -542,7 +575,9 @@ struct OEValuesOps {
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::SetText,        \
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Write,          \
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Copy,           \
-              nullptr, nullptr, nullptr, nullptr, nullptr, #Name},
+              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Text, nullptr,  \
+              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Count,          \
+              nullptr, nullptr, nullptr, #Name},
 
 // Defines construction (setting the default type), destruction and the class
 // description. DESCRIPTION continues the description: .Valid(...) and so on.

@@ -1,0 +1,177 @@
+#include "ofxkit/parse/OESimpleParser.h"
+
+#include <cstring>
+#include <new>
+
+#include "ofxkit/core/OEDataObj.h"
+#include "ofxkit/core/OEDataObjFactory.h"
+#include "ofxkit/core/OETagDictionary.h"
+#include "ofxkit/parse/OEParseEngine.h"
+#include "ofxkit/types/OEBuffer.h"
+#include "ofxkit/types/OEDataConversion.h"
+#include "ofxkit/types/OEUtility.h"
+
+namespace {
+// Overwrites a password value in place, character for character.
+void MaskPassword(OEString& value) {
+  unsigned short n = value.GetStrLength();
+  if (n == 0) return;
+  char* text = value.LockBuffer(static_cast<unsigned short>(n + 1));
+  if (!text) return;
+  memset(text, '*', n);
+  text[n] = '\0';
+  value.UnlockBuffer();
+}
+}  // namespace
+
+OESimpleParser::OESimpleParser() : m_engine(nullptr), m_objectWithError(nullptr) {}
+
+unsigned short OESimpleParser::LogRecord(OEParseWarning warning, const OEString& value, const char* tagName,
+                                         OETagID tag) {
+  OEDataObjFactory* factory = OEDataObj::GetFactory();
+  OEParseException* record = factory ? factory->NewParseException() : nullptr;
+  if (!record) {
+    g_allocFailed = 1;
+    return 0;
+  }
+  record->warning = warning;
+  record->value = value;
+  record->tagName = tagName;
+  record->tag = tag;
+  record->object = GetCurrentObj();
+  return AppendParseException(record);
+}
+
+OEParseStatus OESimpleParser::ReadHeaders(OEParseEngine& engine, OEDataObj* root) {
+  OEHeaderTag tag = OE_HEADER_UNKNOWN;
+  OEString value;
+  OEString name;
+  // First block: MIME or HTTP-style lines (with their names), then the OFX
+  // header lines. A text that starts with the OFX headers reads them here.
+  while (engine.GetHeader(tag, value, &name)) {
+    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, &name);
+    if (status != OE_PARSE_OK) return status;
+  }
+  while (engine.GetHeader(tag, value, nullptr)) {
+    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, nullptr);
+    if (status != OE_PARSE_OK) return status;
+  }
+  OETagID type = root->GetType();
+  if (type == OE_TAG_OFXFILERS || type == OE_TAG_OFXFILERQ) {
+    const OEHeaderValidation* file = dynamic_cast<const OEHeaderValidation*>(root);
+    if (file && !file->ValidateHeaders()) return OE_PARSE_NOT_HANDLED;
+  }
+  return OE_PARSE_OK;
+}
+
+OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) {
+  OETagDictionaryEntry entry{OE_TAG_NONE, nullptr};
+  OEString value;
+  OEParseStatus status = OE_PARSE_OK;
+  int32_t previous = -1;
+  OETagID previousElement = OE_TAG_NONE;
+  while (status == OE_PARSE_OK && previous != OE_TAG_DONE) {
+    bool afterElement = previous == OE_TAG_ELEMENT;
+    OETagType kind = engine.GetOETag(entry, value);
+    previous = kind;
+    // Warnings take their position from the buffer's offset: keep it just
+    // past the item being handled.
+    if (buffer) buffer->SetBufferOffset(static_cast<uint32_t>(engine.ItemEnd()));
+    OEDataObj* current = GetCurrentObj();
+    switch (kind) {
+      case OE_TAG_START:
+        if (!IsValidTag(entry.id)) {
+          LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
+          engine.SkipCurrentTag();
+          break;
+        }
+        status = current->HandleTagStart(&entry);
+        if (status != OE_PARSE_OK) LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
+        break;
+      case OE_TAG_END:
+        if (afterElement && entry.id == previousElement) break;  // an element's optional end tag
+        status = current->HandleTagEnd(&entry);
+        if (entry.id == OE_TAG_OFX) previous = OE_TAG_DONE;  // nothing after </OFX> is read
+        break;
+      case OE_TAG_ELEMENT: {
+        bool password = entry.id == OE_TAG_USERPASS;
+        if (!IsValidTag(entry.id)) {
+          if (password) MaskPassword(value);
+          if (!LogRecord(OEPW_INVALIDELEM, value, entry.name, entry.id)) status = OE_PARSE_NO_PARSER;
+        } else {
+          status = current->HandleTagElement(&entry, value);
+          if (password) MaskPassword(value);
+          if (status != OE_PARSE_OK && !LogRecord(OEPW_INVALIDELEM, value, entry.name, entry.id))
+            status = OE_PARSE_NO_PARSER;
+        }
+        previousElement = entry.id;
+        break;
+      }
+      case OE_TAG_DONE:
+        if (GetDepth() > 0) status = OE_PARSE_NOT_HANDLED;  // the text ended inside aggregates
+        break;
+      default:
+        if (!LogRecord(OEPW_UNKNOWNTAG, value, entry.name, entry.id)) status = OE_PARSE_NO_PARSER;
+        else status = OE_PARSE_NOT_HANDLED;
+        break;
+    }
+  }
+  MaskPassword(value);  // no password text stays in the parser's copy
+  return status;
+}
+
+OEParseStatus OESimpleParser::Parse(OEBuffer* buffer, OEDataObj* root, unsigned short checkRequired) {
+  if (!root || (!buffer && !m_engine)) return OE_PARSE_NO_PARSER;
+  SetCurrentObj(root);
+  root->SetupForParsing(this);
+  g_allocFailed = 0;
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  if (log) {
+    log->DeleteAll();
+    log->SetBuffer(buffer);
+    log->SetParser(this);
+  }
+  uint32_t savedOffset = buffer ? buffer->GetBufferOffset() : 0;
+  OEParseEngine* engine = m_engine;
+  bool ownEngine = false;
+  if (!engine) {
+    engine = new (std::nothrow) OEParseEngine(*buffer);
+    if (!engine) {
+      g_allocFailed = 1;
+      return OE_PARSE_NO_PARSER;
+    }
+    ownEngine = true;
+  }
+  m_objectWithError = nullptr;
+
+  OEParseStatus status = ReadHeaders(*engine, root);
+  if (status == OE_PARSE_OK) {
+    engine->ResetToEndOfHeader();
+    status = ReadBody(*engine, buffer);
+  }
+  if (status != OE_PARSE_OK && status != OE_PARSE_NO_PARSER) m_objectWithError = GetCurrentObj();
+
+  if (checkRequired) {
+    OEDataObj* lacking = root;
+    OETagID missing = OE_TAG_NONE;
+    if (!OEUtility::AllRequiredPresent(&lacking, &missing))
+      AppendParseException(OEPW_MISSINGTAG, OEString(), OEString(), missing, lacking);
+  }
+  if (status == OE_PARSE_OK && GetAnyParseExceptionsLogged()) {
+    status = OE_PARSE_WARNINGS;
+    if (!m_objectWithError) m_objectWithError = root;
+  }
+  if (g_allocFailed) {
+    status = OE_PARSE_NO_PARSER;
+    if (!m_objectWithError) m_objectWithError = root;
+  }
+  if (ownEngine) delete engine;
+  // The log must not keep pointers to a buffer or parser that the caller may
+  // free; later warnings have no position and name no parse object.
+  if (log) {
+    log->SetBuffer(nullptr);
+    log->SetParser(nullptr);
+  }
+  if (buffer) buffer->SetBufferOffset(savedOffset);
+  return status;
+}
