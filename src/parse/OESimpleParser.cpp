@@ -22,6 +22,18 @@ void MaskPassword(OEString& value) {
   text[n] = '\0';
   value.UnlockBuffer();
 }
+// True when, after blanks, the text at `position` is the start tag <OFX>.
+bool AnotherOFXFollows(OEBuffer& buffer, int32_t position) {
+  char c;
+  while ((c = buffer.GetCh(position)) == ' ' || c == '\r' || c == '\n' || c == '\t') ++position;
+  const char* tag = "<OFX>";
+  for (int i = 0; tag[i]; ++i) {
+    c = buffer.GetCh(position + i);
+    if (c >= 'a' && c <= 'z') c = static_cast<char>(c - 'a' + 'A');
+    if (c != tag[i]) return false;
+  }
+  return true;
+}
 }  // namespace
 
 OESimpleParser::OESimpleParser() : m_engine(nullptr), m_objectWithError(nullptr) {}
@@ -91,7 +103,11 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
       case OE_TAG_END:
         if (afterElement && entry.id == previousElement) break;  // an element's optional end tag
         status = current->HandleTagEnd(&entry);
-        if (entry.id == OE_TAG_OFX) previous = OE_TAG_DONE;  // nothing after </OFX> is read
+        // Nothing after </OFX> is read (servers often leave trailing bytes),
+        // except a further OFX aggregate of a file holding several.
+        if (entry.id == OE_TAG_OFX && !(status == OE_PARSE_OK && GetDepth() == 0 && buffer &&
+                                        AnotherOFXFollows(*buffer, engine.ItemEnd())))
+          previous = OE_TAG_DONE;
         break;
       case OE_TAG_ELEMENT: {
         bool password = entry.id == OE_TAG_USERPASS;

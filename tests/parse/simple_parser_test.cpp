@@ -188,6 +188,10 @@ TEST_F(SimpleParserTest, TruncatedAndTrailingText) {
   p = Parse("<OFX><MEMO>a</OFX><MEMO>b</BOGUS><<<");
   EXPECT_EQ(p.status, OE_PARSE_OK);
   EXPECT_EQ(root.GetOfx()->GetMemo(), "a");
+  // A second OFX aggregate is read (the root here holds one, replaced).
+  p = Parse("<OFX><MEMO>a</OFX>\r\n<OFX><MEMO>b</OFX>trailing");
+  EXPECT_EQ(p.status, OE_PARSE_OK);
+  EXPECT_EQ(root.GetOfx()->GetMemo(), "b");
 }
 
 TEST_F(SimpleParserTest, RequiredCheckAndNestingLimit) {
