@@ -1,0 +1,63 @@
+// Shared pieces of the ofxkit command-line tool.
+#pragma once
+
+#include <ofxkit/ofxkit.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace cli {
+
+// Exit statuses of the tool.
+enum Exit : int {
+  kClean = 0,        // parsed with no warning / command done
+  kWarnings = 1,     // parsed to the end, with warnings
+  kParseFailed = 2,  // the parse stopped (malformed OFX)
+  kBadInput = 3,     // missing, unreadable or not an OFX file
+  kUsage = 64        // bad command line
+};
+
+// Command-line arguments after the command name, with --name value options.
+class Args {
+ public:
+  Args(int argc, char** argv, int first);
+  bool Flag(const std::string& name);  // --name present (and consumed)
+  // The value of --name VALUE (or --name=VALUE); empty when absent.
+  std::string Option(const std::string& name);
+  bool HasOption(const std::string& name) const;
+  // The remaining positional arguments; reports unknown options.
+  std::vector<std::string> Positional(std::string* error);
+
+ private:
+  std::vector<std::string> m_args;
+  std::vector<bool> m_used;
+};
+
+// A parsed OFX file: a request or a response file, whichever it is.
+struct ParsedFile {
+  std::unique_ptr<OEFileOFX> file;
+  bool isResponse = false;
+  OEParseStatus status = OE_PARSE_OK;
+  OEDataObj* objectWithError = nullptr;
+};
+
+// Reads a whole file; false with a message when it cannot.
+bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error);
+bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error);
+// Parses an OFX file (request or response, told from its message sets).
+// Returns kBadInput with a message for what is not OFX at all.
+int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error);
+int ExitForStatus(OEParseStatus status);
+// The tag's name, or "?".
+const char* TagName(OETagID tag);
+// Reads a password from the terminal without echo (or a line of standard
+// input when it is not a terminal).
+bool PromptPassword(const char* prompt, OEUserPassword& out);
+
+int CmdDump(int argc, char** argv);
+int CmdStatement(int argc, char** argv);
+int CmdRequest(int argc, char** argv);
+int CmdRespond(int argc, char** argv);
+
+}  // namespace cli

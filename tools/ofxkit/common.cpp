@@ -1,0 +1,165 @@
+#include <termios.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+
+#include "cli.h"
+
+namespace cli {
+
+Args::Args(int argc, char** argv, int first) {
+  for (int i = first; i < argc; ++i) m_args.emplace_back(argv[i]);
+  m_used.assign(m_args.size(), false);
+}
+
+bool Args::Flag(const std::string& name) {
+  bool found = false;
+  for (size_t i = 0; i < m_args.size(); ++i)
+    if (!m_used[i] && m_args[i] == "--" + name) found = m_used[i] = true;
+  return found;
+}
+
+bool Args::HasOption(const std::string& name) const {
+  for (const std::string& a : m_args)
+    if (a == "--" + name || a.rfind("--" + name + "=", 0) == 0) return true;
+  return false;
+}
+
+std::string Args::Option(const std::string& name) {
+  std::string value;
+  for (size_t i = 0; i < m_args.size(); ++i) {
+    if (m_used[i]) continue;
+    if (m_args[i] == "--" + name && i + 1 < m_args.size()) {
+      value = m_args[i + 1];
+      m_used[i] = m_used[i + 1] = true;
+    } else if (m_args[i].rfind("--" + name + "=", 0) == 0) {
+      value = m_args[i].substr(name.size() + 3);
+      m_used[i] = true;
+    }
+  }
+  return value;
+}
+
+std::vector<std::string> Args::Positional(std::string* error) {
+  std::vector<std::string> out;
+  for (size_t i = 0; i < m_args.size(); ++i) {
+    if (m_used[i]) continue;
+    if (m_args[i].size() > 1 && m_args[i][0] == '-' && error && error->empty())
+      *error = "unknown option '" + m_args[i] + "'";
+    else
+      out.push_back(m_args[i]);
+  }
+  return out;
+}
+
+bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
+  FILE* f = std::fopen(path.c_str(), "rb");
+  if (!f) {
+    *error = path + ": " + std::strerror(errno);
+    return false;
+  }
+  char chunk[OEBuffer::kChunk];
+  size_t n;
+  bool ok = true;
+  while ((n = std::fread(chunk, 1, sizeof chunk, f)) > 0) {
+    if (buffer.WriteLarge(chunk, static_cast<uint32_t>(n)) != OEBUF_OK) {
+      *error = path + ": too large (files of up to " + std::to_string(OEBuffer::kMaxBufferSize - 1) +
+               " bytes can be read)";
+      ok = false;
+      break;
+    }
+  }
+  if (ok && std::ferror(f)) {
+    *error = path + ": read error";
+    ok = false;
+  }
+  std::fclose(f);
+  return ok;
+}
+
+bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error) {
+  FILE* f = path == "-" ? stdout : std::fopen(path.c_str(), "wb");
+  if (!f) {
+    *error = path + ": " + std::strerror(errno);
+    return false;
+  }
+  size_t size = buffer.GetBufferSize();
+  bool ok = std::fwrite(buffer.GetBufferPtr(), 1, size, f) == size;
+  if (f != stdout) ok = std::fclose(f) == 0 && ok;
+  if (!ok) *error = path + ": write error";
+  return ok;
+}
+
+namespace {
+// Case-insensitive search for `needle` in the buffer.
+bool Contains(const OEBuffer& buffer, const char* needle) {
+  const char* data = buffer.GetBufferPtr();
+  size_t size = buffer.GetBufferSize(), n = std::strlen(needle);
+  for (size_t i = 0; i + n <= size; ++i) {
+    size_t k = 0;
+    while (k < n && std::toupper(static_cast<unsigned char>(data[i + k])) == needle[k]) ++k;
+    if (k == n) return true;
+  }
+  return false;
+}
+}  // namespace
+
+int ExitForStatus(OEParseStatus status) {
+  if (status == OE_PARSE_OK) return kClean;
+  if (status == OE_PARSE_WARNINGS) return kWarnings;
+  return kParseFailed;
+}
+
+int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error) {
+  OEBuffer buffer;
+  if (!ReadFile(path, buffer, error)) return kBadInput;
+  if (!Contains(buffer, "<OFX>")) {
+    *error = path + ": not an OFX file (no <OFX> aggregate)";
+    return kBadInput;
+  }
+  parsed.isResponse = Contains(buffer, "MSGSRSV1>") || !Contains(buffer, "MSGSRQV1>");
+  if (parsed.isResponse)
+    parsed.file.reset(new OEFileRs());
+  else
+    parsed.file.reset(new OEFileRq());
+  OESimpleParser parser;
+  parsed.status = parser.Parse(&buffer, parsed.file.get(), 0);
+  parsed.objectWithError = parser.GetObjectWithError();
+  return ExitForStatus(parsed.status);
+}
+
+const char* TagName(OETagID tag) {
+  OETagDictionary* dictionary = OETagDictionary::TheOETagDictionary();
+  const char* name = dictionary ? dictionary->GetTagString(tag) : nullptr;
+  return name ? name : "?";
+}
+
+bool PromptPassword(const char* prompt, OEUserPassword& out) {
+  bool terminal = isatty(STDIN_FILENO);
+  termios saved{};
+  if (terminal) {
+    std::fprintf(stderr, "%s", prompt);
+    std::fflush(stderr);
+    tcgetattr(STDIN_FILENO, &saved);
+    termios quiet = saved;
+    quiet.c_lflag &= static_cast<tcflag_t>(~ECHO);
+    tcsetattr(STDIN_FILENO, TCSAFLUSH, &quiet);
+  }
+  char line[256];
+  bool ok = std::fgets(line, sizeof line, stdin) != nullptr;
+  if (terminal) {
+    tcsetattr(STDIN_FILENO, TCSAFLUSH, &saved);
+    std::fprintf(stderr, "\n");
+  }
+  if (ok) {
+    line[std::strcspn(line, "\r\n")] = '\0';
+    out = line;
+  }
+  volatile char* wipe = line;
+  for (size_t i = 0; i < sizeof line; ++i) wipe[i] = 0;
+  return ok && !out.IsEmpty();
+}
+
+}  // namespace cli

@@ -1,0 +1,40 @@
+// ofxkit: reads, writes and exchanges OFX files from the command line.
+#include <cstdio>
+#include <cstring>
+
+#include "cli.h"
+
+namespace {
+struct Command {
+  const char* name;
+  int (*run)(int, char**);
+  const char* summary;
+};
+const Command kCommands[] = {
+    {"dump", cli::CmdDump, "print the object tree and warnings of an OFX file (text or --json)"},
+    {"statement", cli::CmdStatement, "print the transactions of bank and card statements as CSV"},
+    {"request", cli::CmdRequest, "write an OFX request file (request statement ...)"},
+    {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
+};
+
+void Usage(FILE* out) {
+  std::fprintf(out, "usage: ofxkit COMMAND [options]\n\ncommands:\n");
+  for (const Command& c : kCommands) std::fprintf(out, "  %-10s %s\n", c.name, c.summary);
+  std::fprintf(out,
+               "\nRun 'ofxkit COMMAND --help' for a command's options.\n"
+               "Exit status: 0 clean, 1 parsed with warnings, 2 parse failed, 3 unreadable or not OFX,\n"
+               "64 bad command line.\n");
+}
+}  // namespace
+
+int main(int argc, char** argv) {
+  if (argc < 2 || !std::strcmp(argv[1], "--help") || !std::strcmp(argv[1], "-h") || !std::strcmp(argv[1], "help")) {
+    Usage(argc < 2 ? stderr : stdout);
+    return argc < 2 ? cli::kUsage : cli::kClean;
+  }
+  for (const Command& c : kCommands)
+    if (!std::strcmp(argv[1], c.name)) return c.run(argc, argv);
+  std::fprintf(stderr, "ofxkit: unknown command '%s'\n\n", argv[1]);
+  Usage(stderr);
+  return cli::kUsage;
+}
