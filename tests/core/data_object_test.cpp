@@ -2,6 +2,8 @@
 
 #include "ofxkit/ofxkit.h"
 
+#include "support/log_fixture.h"
+
 namespace {
 
 // A data object with forty valid tags (ids 101..140) and three required ones.
@@ -29,21 +31,7 @@ class WideObj : public OEDataObj {
 
 OETagID Tag(int id) { return static_cast<OETagID>(id); }
 
-class LogTest : public ::testing::Test {
- protected:
-  void SetUp() override {
-    log = OEParseLogger::TheOEParseLogger();
-    ASSERT_NE(log, nullptr);
-    log->SetBuffer(nullptr);
-    log->SetParser(nullptr);
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
-  void TearDown() override { log->DeleteAll(); }
-  OEParseLogger* log = nullptr;
-};
-
-using DataObjTest = LogTest;
+using DataObjTest = LogFixture;
 
 }  // namespace
 

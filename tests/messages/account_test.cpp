@@ -4,16 +4,11 @@
 
 #include "ofxkit/ofxkit.h"
 
+#include "support/log_fixture.h"
+
 namespace {
-class AccountTest : public ::testing::Test {
+class AccountTest : public LogFixture {
  protected:
-  void SetUp() override {
-    log = OEParseLogger::TheOEParseLogger();
-    log->SetBuffer(nullptr);
-    log->SetParser(nullptr);
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
   // Writes the object with its own start and end tags, as a parent would.
   std::string Write(const OEDataObj& obj, OEBuildStringOpt option, OEBuildStatus* status = nullptr) {
     struct Wrapper : OEDataObj {
@@ -28,7 +23,6 @@ class AccountTest : public ::testing::Test {
     lastInError = writer.GetObjectInError();
     return std::string(buffer.GetBufferPtr(), buffer.GetBufferSize());
   }
-  OEParseLogger* log = nullptr;
   OEDataObj* lastInError = nullptr;
 };
 }  // namespace

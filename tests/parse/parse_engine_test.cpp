@@ -13,6 +13,8 @@
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/types/OEBuffer.h"
 
+#include "support/log_fixture.h"
+
 namespace {
 
 // Opens the protected item layer for the tests.
@@ -39,20 +41,8 @@ using Item = OEParseEngine::OETagItemInfo;
 using Strings = std::vector<std::string>;
 const Strings kNoWarnings;
 
-class ParseEngineTest : public ::testing::Test {
+class ParseEngineTest : public LogFixture {
  protected:
-  void SetUp() override {
-    log = OEParseLogger::TheOEParseLogger();
-    ASSERT_NE(log, nullptr);
-    log->SetBuffer(nullptr);
-    log->SetParser(nullptr);
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
-  void TearDown() override {
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
 
   // The buffer's allocation is exactly the text, so that a read past the end
   // shows under AddressSanitizer.
@@ -109,7 +99,6 @@ class ParseEngineTest : public ::testing::Test {
     return out;
   }
 
-  OEParseLogger* log = nullptr;
   std::unique_ptr<OEBuffer> buffer;
   std::unique_ptr<Engine> engine;
 };

@@ -2,26 +2,9 @@
 
 #include "ofxkit/ofxkit.h"
 
-namespace {
-class ParseLogTest : public ::testing::Test {
- protected:
-  void SetUp() override {
-    log = OEParseLogger::TheOEParseLogger();
-    ASSERT_NE(log, nullptr);
-    log->SetBuffer(nullptr);
-    log->SetParser(nullptr);
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
-  void TearDown() override {
-    log->SetBuffer(nullptr);
-    log->SetParser(nullptr);
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
-  OEParseLogger* log = nullptr;
-};
-}  // namespace
+#include "support/log_fixture.h"
+
+using ParseLogTest = LogFixture;
 
 TEST_F(ParseLogTest, RecordsCarryWhatWasReported) {
   OEDataObj obj;

@@ -5,6 +5,8 @@
 
 #include "ofxkit/ofxkit.h"
 
+#include "support/log_fixture.h"
+
 // Small aggregates built with the library's declarative machinery, standing
 // in for a response tree: root > OFX > (SIGNONMSGSRSV1, BANKACCTFROM*, elements).
 class TSignOn;
@@ -65,7 +67,7 @@ struct Parsed {
   OEDataObj* withError;
 };
 
-class SimpleParserTest : public ::testing::Test {
+class SimpleParserTest : public LogFixture {
  protected:
   Parsed Parse(const std::string& text, unsigned short checkRequired = 0) {
     OEBuffer buffer;
@@ -74,12 +76,7 @@ class SimpleParserTest : public ::testing::Test {
     OEParseStatus status = parser.Parse(&buffer, &root, checkRequired);
     return Parsed{status, parser.GetObjectWithError()};
   }
-  OEParseLogger* Log() { return OEParseLogger::TheOEParseLogger(); }
-  bool Logged(OEParseWarning w) {
-    for (unsigned short i = 0; i < Log()->Entries(); ++i)
-      if (Log()->Get(i)->warning == w) return true;
-    return false;
-  }
+  OEParseLogger* Log() { return log; }
   TRoot root;
 };
 

@@ -10,6 +10,8 @@
 #include "ofxkit/types/OEDateTime.h"
 #include "ofxkit/types/OEPrecisionInteger.h"
 
+#include "support/log_fixture.h"
+
 namespace {
 
 struct Fields {
@@ -37,17 +39,8 @@ std::string Text(const OEDateTimeBase& v) {
 
 std::string Seconds(OEPrecisionInteger v) { return static_cast<char*>(v); }
 
-class DateTimeTest : public ::testing::Test {
+class DateTimeTest : public LogFixture {
  protected:
-  void SetUp() override {
-    log = OEParseLogger::TheOEParseLogger();
-    ASSERT_NE(log, nullptr);
-    log->SetBuffer(nullptr);
-    log->SetParser(nullptr);
-    log->EnableLogging(1);
-    log->DeleteAll();
-  }
-  void TearDown() override { log->DeleteAll(); }
 
   // The log holds exactly one warning, with this code and these texts.
   void ExpectOneWarning(OEParseWarning code, const char* where, const char* value) {
@@ -65,7 +58,6 @@ class DateTimeTest : public ::testing::Test {
     log->DeleteAll();
   }
 
-  OEParseLogger* log = nullptr;
 };
 
 // ---------------------------------------------------------------------------
