@@ -56,7 +56,7 @@ int main() {
 
   std::printf("bad values are kept out and reported:\n");
   OEPrecisionInteger bad;
-  bad.ConvertStringToOEPrecisionInteger("12,34");
+  bad.ConvertStringToOEPrecisionInteger("12.3.4");
   account.SetAccountType(OEString("SAVNGS"));
   account.SetBankID("1210002481234");
   PrintWarnings();
