@@ -13,8 +13,12 @@ void PrintWarnings() {
     const OEParseException* w = log->Get(i);
     OEString code;
     w->WarningString(code);
-    std::printf("  warning %s tag=%s value=\"%s\"\n", code.c_str(), OEUtility::TagToString(w->tag).c_str(),
-                w->value.c_str());
+    // Conversions outside an element name no tag; their text is the input.
+    if (w->tag == OE_TAG_NONE)
+      std::printf("  warning %s text=\"%s\"\n", code.c_str(), w->tagName.c_str());
+    else
+      std::printf("  warning %s tag=%s value=\"%s\"\n", code.c_str(), OEUtility::TagToString(w->tag).c_str(),
+                  w->value.c_str());
   }
   log->DeleteAll();
 }
