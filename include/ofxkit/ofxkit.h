@@ -20,6 +20,17 @@
 
 #include "ofxkit/messages/bank/OEAccount.h"
 #include "ofxkit/messages/bank/OECurrency.h"
+#include "ofxkit/messages/bank/OEBalance.h"
+#include "ofxkit/messages/bank/OEBankTransactionList.h"
+#include "ofxkit/messages/bank/OEStatementRq.h"
+#include "ofxkit/messages/bank/OEStatementRs.h"
+#include "ofxkit/messages/bank/OEStopCheckProfile.h"
+#include "ofxkit/messages/bank/OEBankMessageSet.h"
+#include "ofxkit/messages/billpay/OEPayee.h"
+#include "ofxkit/messages/mail/OEEMailProfile.h"
+#include "ofxkit/messages/profile/OEMessageSetCore.h"
+#include "ofxkit/messages/profile/OEMessageSetVersion.h"
+#include "ofxkit/messages/xfer/OEXferProfile.h"
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/parse/OEParser.h"
@@ -27,3 +38,4 @@
 #include "ofxkit/parse/OESimpleParser.h"
 
 #include "ofxkit/envelope/OETransBase.h"
+#include "ofxkit/envelope/OERequest.h"

@@ -164,11 +164,10 @@ OEParseStatus OEAggregate::HandleTagStart(const OETagDictionaryEntry* const entr
   if (!d || !d->create) return OE_PARSE_NOT_HANDLED;
   OEDataObjFactory* factory = GetFactory();
   if (!factory) return OE_PARSE_NO_PARSER;
+  // A creator that runs out of memory has set g_allocFailed; one that knows
+  // no class for the tag (an aggregate this build does not model) has not.
   OEDataObj* child = d->create(factory, entry->id);
-  if (!child) {
-    g_allocFailed = 1;
-    return OE_PARSE_NO_PARSER;
-  }
+  if (!child) return OE_PARSE_NO_PARSER;
   if (!d->put(this, child)) {
     delete child;
     return OE_PARSE_NO_PARSER;

@@ -13,7 +13,7 @@
 OEDataObjFactory* OEDataObj::m_factoryObj = nullptr;
 unsigned short OEDataObj::m_factoryAllocated = 0;
 
-OEDataObj::OEDataObj() : m_parser(nullptr), m_present{0, 0, 0}, m_type(OE_TAG_NONE) { m_factoryAllocated = 0; }
+OEDataObj::OEDataObj() : m_parser(nullptr), m_present{0, 0, 0}, m_type(OE_TAG_NONE) {}
 
 OEDataObj::OEDataObj(const OEDataObj& other)
     : m_parser(other.m_parser), m_present{other.m_present[0], other.m_present[1], other.m_present[2]},
@@ -24,14 +24,7 @@ OEDataObj& OEDataObj::operator=(const OEDataObj& other) {
   return *this;
 }
 
-OEDataObj::~OEDataObj() {
-  if (m_factoryAllocated && m_factoryObj) {
-    OEDataObjFactory* factory = m_factoryObj;
-    m_factoryObj = nullptr;
-    m_factoryAllocated = 0;
-    delete factory;
-  }
-}
+OEDataObj::~OEDataObj() = default;
 
 unsigned short OEDataObj::CopyBaseMembersFrom(const OEDataObj* other) {
   if (!other) return 0;
@@ -180,17 +173,26 @@ OEDataObj* OEDataObj::GetChild(unsigned short) const { return nullptr; }
 
 unsigned short OEDataObj::GetNumberOfChildren() const { return 0; }
 
+// The library's default factory is made once, on first need, and lives for
+// the process; it is never deleted while objects may still ask for it. An
+// installed factory stays the application's.
+namespace {
+OEDataObjFactory* DefaultFactory() {
+  static OEDataObjFactory* factory = new (std::nothrow) OEDataObjFactory();
+  return factory;
+}
+}  // namespace
+
 unsigned short OEDataObj::SetFactory(OEDataObjFactory* factory) {
   if (!factory) return 0;
-  if (m_factoryAllocated && m_factoryObj != factory) delete m_factoryObj;
   m_factoryObj = factory;
-  m_factoryAllocated = 0;
+  m_factoryAllocated = factory == DefaultFactory();
   return 1;
 }
 
 OEDataObjFactory* OEDataObj::GetFactory() {
   if (!m_factoryObj) {
-    m_factoryObj = new (std::nothrow) OEDataObjFactory();
+    m_factoryObj = DefaultFactory();
     if (!m_factoryObj) {
       g_allocFailed = 1;
       return nullptr;
@@ -198,6 +200,13 @@ OEDataObjFactory* OEDataObj::GetFactory() {
     m_factoryAllocated = 1;
   }
   return m_factoryObj;
+}
+
+// Puts the library's default factory back (after an application's factory
+// is gone).
+void OEDataObj::ResetFactory() {
+  m_factoryObj = DefaultFactory();
+  m_factoryAllocated = 1;
 }
 
 // ---------------------------------------------------------------------------

@@ -172,9 +172,10 @@ TEST_F(DataObjTest, FactoryHook) {
   { WideObj temp; }
   EXPECT_EQ(OEDataObj::GetFactory(), &mine);
 
-  // Leave a lasting factory installed for the rest of the process.
-  static OEDataObjFactory lasting;
-  OEDataObj::SetFactory(&lasting);
+  // Back to the library's own factory, the one it had before.
+  OEDataObj::ResetFactory();
+  EXPECT_EQ(OEDataObj::GetFactory(), original);
+  OEDataObjFactory& lasting = *original;
 
   unsigned short* number = lasting.NewOEUShort();
   ASSERT_NE(number, nullptr);

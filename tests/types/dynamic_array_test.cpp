@@ -58,7 +58,9 @@ TEST(OEDynamicArray, ManyAppendsStayIndexed) {
   }
   EXPECT_EQ(deaths, 20000);
   OEDynamicArrayOEUShort numbers;
-  EXPECT_EQ(numbers.Set(65535, new unsigned short(1)), 0);  // beyond 16-bit indices
+  unsigned short* number = new unsigned short(1);
+  EXPECT_EQ(numbers.Set(65535, number), 0);  // beyond 16-bit indices: refused, still ours
+  delete number;
 }
 
 TEST(OEDynamicArray, StringArraysGiveTheirLimit) {

@@ -53,6 +53,8 @@ class OEDataObj {
 
   static unsigned short SetFactory(OEDataObjFactory* factory);
   static OEDataObjFactory* GetFactory();
+  // Reinstalls the library's default factory.
+  static void ResetFactory();
 
  protected:
   OEParser* GetParser() const { return m_parser; }

@@ -1,0 +1,9 @@
+#include "ofxkit/messages/bank/OEBankMessageSet.h"
+
+OE_DEFINE_AGGREGATE(OEBankMessageSetV1, OEMessageSetVersion, OE_BANKMESSAGESETV1_FIELDS, BANKMSGSETV1,
+                    .Valid(OE_TAGS(MSGSETCORE, XFERPROF, STPCHKPROF, EMAILPROF, INVALIDACCTTYPE, CLOSINGAVAIL))
+                    .Required(OE_TAGS(MSGSETCORE, EMAILPROF, CLOSINGAVAIL)))
+OE_DEFINE_AGGREGATE(OECreditCardMessageSetV1, OEMessageSetVersion, OE_CREDITCARDMESSAGESETV1_FIELDS,
+                    CREDITCARDMSGSETV1,
+                    .Valid(OE_TAGS(MSGSETCORE, CLOSINGAVAIL))
+                    .Required(OE_TAGS(MSGSETCORE, CLOSINGAVAIL)))

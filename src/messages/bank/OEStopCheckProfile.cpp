@@ -1,0 +1,5 @@
+#include "ofxkit/messages/bank/OEStopCheckProfile.h"
+
+OE_DEFINE_AGGREGATE(OEStopCheckProfile, OEAggregate, OE_STOPCHECKPROFILE_FIELDS, STPCHKPROF,
+                    .Valid(OE_TAGS(PROCDAYSOFF, PROCENDTM, CANUSERANGE, CANUSEDESC, STPCHKFEE))
+                    .Required(OE_TAGS(PROCENDTM, CANUSERANGE, CANUSEDESC, STPCHKFEE)))

@@ -1,0 +1,5 @@
+#include "ofxkit/messages/profile/OEMessageSetVersion.h"
+
+OE_DEFINE_AGGREGATE(OEMessageSetVersion, OEAggregate, OE_MESSAGESETVERSION_FIELDS, PROFMSGSETV1,
+                    .Valid(OE_TAGS(MSGSETCORE))
+                    .Required(OE_TAGS(MSGSETCORE)))

@@ -1,0 +1,63 @@
+// Helpers shared by the envelope tests: writing an object as its parent
+// would, parsing a small text into a root, and reading the parse log.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "ofxkit/envelope/OERequest.h"
+#include "ofxkit/ofxkit.h"
+#include "support/log_fixture.h"
+
+class EnvelopeTest : public LogFixture {
+ protected:
+
+  // Writes obj with its own start and end tags; OE_BUILD_STRICT strings.
+  std::string Write(const OEDataObj& obj, OEBuildStatus* status = nullptr, unsigned short checkRequired = 0) {
+    struct Holder : OEDataObj {
+      const OEDataObj* inner = nullptr;
+      OEBuildStatus Build(OEBuilder* b) const override { return inner->BuildObject(b, OE_TAG_NONE); }
+    } holder;
+    holder.inner = &obj;
+    OEBuilder writer;
+    OEBuffer buffer;
+    OEBuildStatus s = writer.Build(&buffer, &holder, OE_BUILD_STRICT, checkRequired);
+    if (status) *status = s;
+    inError = writer.GetObjectInError();
+    return std::string(buffer.GetBufferPtr(), buffer.GetBufferSize());
+  }
+
+  OEParseStatus Parse(const std::string& text, OEDataObj* root) {
+    OEBuffer buffer;
+    buffer.WriteLarge(text.data(), static_cast<uint32_t>(text.size()));
+    OESimpleParser parser;
+    return parser.Parse(&buffer, root, 0);
+  }
+
+  static std::vector<OETagID> ValidTags(const OEDataObj& obj) {
+    OEArrayOfTags tags{nullptr, 0};
+    obj.GetArrayOfValidTags(tags);
+    return std::vector<OETagID>(tags.tags, tags.tags + tags.count);
+  }
+
+  // How many warnings of one code the log holds.
+  unsigned short Count(OEParseWarning warning) const {
+    unsigned short n = 0;
+    for (unsigned short i = 0; i < log->Entries(); ++i)
+      if (log->Get(i)->warning == warning) ++n;
+    return n;
+  }
+  bool LogMentions(const std::string& text) const {
+    for (unsigned short i = 0; i < log->Entries(); ++i) {
+      const OEParseException* e = log->Get(i);
+      if (std::string(e->value.c_str()).find(text) != std::string::npos ||
+          std::string(e->tagName.c_str()).find(text) != std::string::npos)
+        return true;
+    }
+    return false;
+  }
+
+  OEDataObj* inError = nullptr;
+};
