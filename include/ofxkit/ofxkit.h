@@ -39,3 +39,4 @@
 
 #include "ofxkit/envelope/OETransBase.h"
 #include "ofxkit/envelope/OERequest.h"
+#include "ofxkit/envelope/OEFile.h"

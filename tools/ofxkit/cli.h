@@ -44,7 +44,7 @@ struct ParsedFile {
 
 // Reads a whole file; false with a message when it cannot.
 bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error);
-bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error);
+bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile = false);
 // Parses an OFX file (request or response, told from its message sets).
 // Returns kBadInput with a message for what is not OFX at all.
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error);
@@ -54,6 +54,25 @@ const char* TagName(OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard
 // input when it is not a terminal).
 bool PromptPassword(const char* prompt, OEUserPassword& out);
+
+// What a statement request names.
+struct StatementRequestOptions {
+  std::string org, fid, user, account, bankId, type, start, end, appId, appVersion;
+};
+// Writes a sign-on + statement request file into out; false (with a message
+// on standard error) when an option is not valid.
+bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserPassword& password, OEBuffer& out);
+
+// How a request is answered.
+struct RespondOptions {
+  unsigned transactions = 25;
+  bool checkCredentials = false;
+  std::string user;
+  OEUserPassword password;
+};
+// Fills response with the answer to request; false when the credentials did
+// not match (the response then says so).
+bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFileRs& response);
 
 int CmdDump(int argc, char** argv);
 int CmdStatement(int argc, char** argv);

@@ -1,3 +1,4 @@
+#include <fcntl.h>
 #include <termios.h>
 #include <unistd.h>
 
@@ -27,15 +28,17 @@ bool Args::HasOption(const std::string& name) const {
   return false;
 }
 
+// One-letter options are written -o VALUE, longer ones --name VALUE or --name=VALUE.
 std::string Args::Option(const std::string& name) {
   std::string value;
+  const std::string flag = (name.size() == 1 ? "-" : "--") + name;
   for (size_t i = 0; i < m_args.size(); ++i) {
     if (m_used[i]) continue;
-    if (m_args[i] == "--" + name && i + 1 < m_args.size()) {
+    if (m_args[i] == flag && i + 1 < m_args.size()) {
       value = m_args[i + 1];
       m_used[i] = m_used[i + 1] = true;
-    } else if (m_args[i].rfind("--" + name + "=", 0) == 0) {
-      value = m_args[i].substr(name.size() + 3);
+    } else if (m_args[i].rfind(flag + "=", 0) == 0) {
+      value = m_args[i].substr(flag.size() + 1);
       m_used[i] = true;
     }
   }
@@ -79,8 +82,14 @@ bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
   return ok;
 }
 
-bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error) {
-  FILE* f = path == "-" ? stdout : std::fopen(path.c_str(), "wb");
+bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile) {
+  FILE* f = stdout;
+  if (path != "-") {
+    // A request holds a password: such a file is readable by its owner only.
+    int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, privateFile ? 0600 : 0644);
+    f = fd >= 0 ? fdopen(fd, "wb") : nullptr;
+    if (fd >= 0 && !f) ::close(fd);
+  }
   if (!f) {
     *error = path + ": " + std::strerror(errno);
     return false;

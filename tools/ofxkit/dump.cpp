@@ -76,13 +76,13 @@ void DumpJson(const OEDataObj* obj, FILE* out) {
   std::vector<Element> headers;
   HeadersOf(obj, headers);
   if (!headers.empty()) {
-    nlohmann::json h = nlohmann::json::object();
+    nlohmann::ordered_json h = nlohmann::ordered_json::object();
     for (const Element& e : headers) h[HeaderName(e.tag)] = e.value;
     std::fprintf(out, ",\"headers\":%s", h.dump().c_str());
   }
   std::vector<Element> elements = ElementsOf(obj);
   if (!elements.empty()) {
-    nlohmann::json els = nlohmann::json::object();
+    nlohmann::ordered_json els = nlohmann::ordered_json::object();
     for (const Element& e : elements) {
       const char* name = TagName(e.tag);
       if (!els.contains(name))
@@ -90,9 +90,9 @@ void DumpJson(const OEDataObj* obj, FILE* out) {
       else if (els[name].is_array())
         els[name].push_back(e.value);
       else
-        els[name] = nlohmann::json::array({els[name], e.value});
+        els[name] = nlohmann::ordered_json::array({els[name], e.value});
     }
-    std::fprintf(out, ",\"elements\":%s", els.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace).c_str());
+    std::fprintf(out, ",\"elements\":%s", els.dump(-1, ' ', false, nlohmann::ordered_json::error_handler_t::replace).c_str());
   }
   unsigned short n = obj->GetNumberOfChildren();
   bool first = true;
@@ -142,7 +142,7 @@ int CmdDump(int argc, char** argv) {
     std::fprintf(stdout, ",\"warnings\":[");
     for (unsigned short i = 0; i < log->Entries(); ++i)
       std::fprintf(stdout, "%s%s", i ? "," : "", WarningJson(*log->Get(i)).dump(-1, ' ', false,
-                                                                          nlohmann::json::error_handler_t::replace).c_str());
+                                                                          nlohmann::ordered_json::error_handler_t::replace).c_str());
     std::fprintf(stdout, "]}\n");
   } else {
     DumpText(parsed.file.get(), 0, stdout);
