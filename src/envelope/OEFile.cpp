@@ -81,16 +81,15 @@ T* AppendMade(Array& array, T* made) {
   return made;
 }
 
-// TEMPORARY until the creators are in the factory.
-OEMIMEHeader* MakeMIMEHeader(OEDataObjFactory*) { return new (std::nothrow) OEMIMEHeader(); }
-OEFile* MakePartLike(OEDataObjFactory*, OETagID type) {
+// A part of the same kind as one of that type, made through the factory.
+OEFile* MakePartLike(OEDataObjFactory* factory, OETagID type) {
   switch (type) {
     case OE_TAG_OFXFILERQ:
-      return new (std::nothrow) OEFileRq();
+      return factory->NewFileRq();
     case OE_TAG_OFXFILERS:
-      return new (std::nothrow) OEFileRs();
+      return factory->NewFileRs();
     default:
-      return new (std::nothrow) OEFile();
+      return factory->NewSubfile();
   }
 }
 
@@ -101,7 +100,7 @@ OEFile* MakePartLike(OEDataObjFactory*, OETagID type) {
 
 OEMIMEHeader* OEArrayElementTraits<OEMIMEHeader>::New() {
   OEDataObjFactory* factory = OEDataObj::GetFactory();
-  return factory ? MakeMIMEHeader(factory) : nullptr;
+  return factory ? factory->NewMIMEHeader() : nullptr;
 }
 
 OEFile* OEArrayElementTraits<OEFile>::New() {
