@@ -29,7 +29,8 @@
 //          that stands as "BANKACCTFROM" or "CCACCTFROM"); declares nothing.
 //   LIST   owned repeated children; GetNum<Name>(), Get<Name>(i),
 //          Set<Name>(i, Type*), Append<Name>(Type*), Clear<Name>().
-//   VALUES a repeated element of a VALUE type; GetNum<Name>(), Get<Name>(i),
+//   VALUES a repeated element of a VALUE type or an OEString type;
+//          GetNum<Name>(), Get<Name>(i),
 //          Append<Name>(value or text), Set<Name>(i, value or text), Clear<Name>().
 //
 // The description gives: .Valid(tags) in OFX order (the order of the
@@ -133,6 +134,22 @@ OE_VALUE_TRAITS(int32_t, OEDataConversion::StringToSLong(text, value) != 0, b->A
 OE_VALUE_TRAITS(uint32_t, OEDataConversion::StringToULong(text, value) != 0, b->AddTagOEULong(tag, value))
 OE_VALUE_TRAITS(OELanguage, OEDataConversion::StringToLanguage(text, value) != 0, b->AddTagOELanguage(tag, value))
 #undef OE_VALUE_TRAITS
+
+// Repeated text elements (a VALUES field of an OEString type): the text is
+// stored whole (an over-long one is left to the builder's strict check) and
+// written as a string element; an empty text is not a value.
+template <class S>
+struct OEValueTraits<S, std::enable_if_t<std::is_base_of<OEString, S>::value>> {
+  static bool FromText(const OEString& text, S& value) {
+    value = text;
+    return !value.IsNull();
+  }
+  static OEBuildStatus Write(OEBuilder* b, OETagID tag, const S& value) { return b->AddTagOEString(tag, value); }
+  static unsigned short ToText(const S& value, OEString& out) {
+    out = value;
+    return 1;
+  }
+};
 
 // The Y/N flags.
 struct OEFlagTraits {

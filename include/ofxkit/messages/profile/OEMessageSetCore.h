@@ -3,25 +3,7 @@
 // extension's time-out and certificate ids.
 #pragma once
 
-#include <type_traits>
-
 #include "ofxkit/core/OEAggregate.h"
-
-// Repeated text elements (a VALUES field of an OEString type): the text is
-// stored whole (an over-long one is left to the builder's strict check) and
-// written as a string element; an empty text is not a value.
-template <class S>
-struct OEValueTraits<S, std::enable_if_t<std::is_base_of<OEString, S>::value>> {
-  static bool FromText(const OEString& text, S& value) {
-    value = text;
-    return !value.IsNull();
-  }
-  static OEBuildStatus Write(OEBuilder* b, OETagID tag, const S& value) { return b->AddTagOEString(tag, value); }
-  static unsigned short ToText(const S& value, OEString& out) {
-    out = value;
-    return 1;
-  }
-};
 
 #define OE_MESSAGESETCORE_FIELDS(X)                                  \
   X(VALUE, Ver, VER, int32_t)                                        \
