@@ -23,8 +23,13 @@ bool ReadAll(const std::string& path, OEBuffer& buffer) {
   return true;
 }
 
+// Large documents grow their buffers in big steps: a 512-byte step would
+// copy a multi-megabyte text thousands of times where realloc cannot extend
+// in place (under the sanitizers, for one).
+constexpr uint32_t kStep = 1u << 20;
+
 std::string Write(OEFileRs& file) {
-  OEBuffer out;
+  OEBuffer out(0, kStep);
   OEBuilder builder;
   EXPECT_EQ(builder.Build(&out, &file, OE_BUILD_LENIENT, 0), OE_BUILD_OK);
   return std::string(out.GetBufferPtr(), out.GetBufferSize());
@@ -32,7 +37,7 @@ std::string Write(OEFileRs& file) {
 
 // Parses text into file; the status.
 OEParseStatus Parse(const std::string& text, OEFileRs& file) {
-  OEBuffer buffer;
+  OEBuffer buffer(static_cast<uint32_t>(text.size() + 1), kStep);
   buffer.WriteLarge(text.data(), static_cast<uint32_t>(text.size()));
   OESimpleParser parser;
   return parser.Parse(&buffer, &file, 0);

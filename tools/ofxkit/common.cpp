@@ -63,6 +63,12 @@ bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
     *error = path + ": " + std::strerror(errno);
     return false;
   }
+  // Room for the whole file at once, rather than growing step by step.
+  if (std::fseek(f, 0, SEEK_END) == 0) {
+    long size = std::ftell(f);
+    if (size > 0 && size < static_cast<long>(OEBuffer::kMaxBufferSize)) buffer.AllocateTo(static_cast<uint32_t>(size) + 1);
+    std::rewind(f);
+  }
   char chunk[OEBuffer::kChunk];
   size_t n;
   bool ok = true;

@@ -162,7 +162,7 @@ int CmdRequest(int argc, char** argv) {
     std::fprintf(stderr, "ofxkit request: no password given\n");
     return kUsage;
   }
-  OEBuffer out;
+  OEBuffer out(0, 1u << 16);
   if (!BuildStatementRequest(o, password, out)) return kUsage;
   if (output.empty()) output = "-";
   if (!WriteFile(output, out, &error, true)) {

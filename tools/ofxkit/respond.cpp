@@ -183,7 +183,7 @@ int CmdRespond(int argc, char** argv) {
   }
   OEFileRs response;
   AnswerRequest(*static_cast<OEFileRq*>(parsed.file.get()), options, response);
-  OEBuffer out;
+  OEBuffer out(0, 1u << 16);
   OEBuilder builder;
   OEBuildStatus status = builder.Build(&out, &response, OE_BUILD_STRICT, 1);
   if (status != OE_BUILD_OK) {
