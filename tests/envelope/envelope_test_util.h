@@ -10,31 +10,20 @@
 #include "ofxkit/envelope/OERequest.h"
 #include "ofxkit/ofxkit.h"
 #include "support/log_fixture.h"
+#include "support/ofx_text.h"
 
 class EnvelopeTest : public LogFixture {
  protected:
 
   // Writes obj with its own start and end tags; OE_BUILD_STRICT strings.
   std::string Write(const OEDataObj& obj, OEBuildStatus* status = nullptr, unsigned short checkRequired = 0) {
-    struct Holder : OEDataObj {
-      const OEDataObj* inner = nullptr;
-      OEBuildStatus Build(OEBuilder* b) const override { return inner->BuildObject(b, OE_TAG_NONE); }
-    } holder;
-    holder.inner = &obj;
-    OEBuilder writer;
-    OEBuffer buffer;
-    OEBuildStatus s = writer.Build(&buffer, &holder, OE_BUILD_STRICT, checkRequired);
-    if (status) *status = s;
-    inError = writer.GetObjectInError();
-    return std::string(buffer.GetBufferPtr(), buffer.GetBufferSize());
+    WrittenText written = WriteUnderOwnTag(obj, OE_BUILD_STRICT, checkRequired);
+    if (status) *status = written.status;
+    inError = written.inError;
+    return written.text;
   }
 
-  OEParseStatus Parse(const std::string& text, OEDataObj* root) {
-    OEBuffer buffer;
-    buffer.WriteLarge(text.data(), static_cast<uint32_t>(text.size()));
-    OESimpleParser parser;
-    return parser.Parse(&buffer, root, 0);
-  }
+  OEParseStatus Parse(const std::string& text, OEDataObj* root) { return ParseText(text, root); }
 
   static std::vector<OETagID> ValidTags(const OEDataObj& obj) {
     OEArrayOfTags tags{nullptr, 0};

@@ -5,23 +5,17 @@
 #include "ofxkit/ofxkit.h"
 
 #include "support/log_fixture.h"
+#include "support/ofx_text.h"
 
 namespace {
 class AccountTest : public LogFixture {
  protected:
   // Writes the object with its own start and end tags, as a parent would.
   std::string Write(const OEDataObj& obj, OEBuildStringOpt option, OEBuildStatus* status = nullptr) {
-    struct Wrapper : OEDataObj {
-      const OEDataObj* inner = nullptr;
-      OEBuildStatus Build(OEBuilder* b) const override { return inner->BuildObject(b, OE_TAG_NONE); }
-    } wrapper;
-    wrapper.inner = &obj;
-    OEBuilder writer;
-    OEBuffer buffer;
-    OEBuildStatus s = writer.Build(&buffer, &wrapper, option, 0);
-    if (status) *status = s;
-    lastInError = writer.GetObjectInError();
-    return std::string(buffer.GetBufferPtr(), buffer.GetBufferSize());
+    WrittenText written = WriteUnderOwnTag(obj, option);
+    if (status) *status = written.status;
+    lastInError = written.inError;
+    return written.text;
   }
   OEDataObj* lastInError = nullptr;
 };

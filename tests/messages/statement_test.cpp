@@ -6,6 +6,7 @@
 #include "ofxkit/ofxkit.h"
 
 #include "support/log_fixture.h"
+#include "support/ofx_text.h"
 
 namespace {
 // A stand-in for the wrappers and lists that hold these aggregates.
@@ -33,24 +34,14 @@ class FactoryScope {
 class StatementTest : public LogFixture {
  protected:
   OEParseStatus Parse(const std::string& text, StmtRoot& into, unsigned short checkRequired = 0) {
-    OEBuffer buffer;
-    buffer.WriteLarge(text.data(), static_cast<uint32_t>(text.size()));
-    OESimpleParser parser;
-    return parser.Parse(&buffer, &into, checkRequired);
+    return ParseText(text, &into, checkRequired);
   }
   // The object's text under its own tag, as its parent would write it.
   std::string Write(const OEDataObj& obj, OEBuildStatus* status = nullptr, OEBuildStringOpt option = OE_BUILD_STRICT) {
-    struct Wrapper : OEDataObj {
-      const OEDataObj* inner = nullptr;
-      OEBuildStatus Build(OEBuilder* b) const override { return inner->BuildObject(b, OE_TAG_NONE); }
-    } wrapper;
-    wrapper.inner = &obj;
-    OEBuilder writer;
-    OEBuffer buffer;
-    OEBuildStatus s = writer.Build(&buffer, &wrapper, option, 0);
-    if (status) *status = s;
-    else EXPECT_EQ(s, OE_BUILD_OK);
-    return std::string(buffer.GetBufferPtr(), buffer.GetBufferSize());
+    WrittenText written = WriteUnderOwnTag(obj, option);
+    if (status) *status = written.status;
+    else EXPECT_EQ(written.status, OE_BUILD_OK);
+    return written.text;
   }
   static std::string Amount(const OEPrecisionInteger& value) {
     char text[OEPrecisionInteger::kTextSize + 1];
