@@ -16,6 +16,7 @@ echo "demo-password" | "$ofxkit" request statement --org "Demo Bank" --fid 1234 
 echo "== response: a bank's answer, written by the library"
 echo "demo-password" | "$ofxkit" respond --user alice --password-stdin --transactions 8 "$work/request.ofx" \
   -o "$work/response.ofx"
-"$ofxkit" dump "$work/response.ofx" | head -40
+"$ofxkit" dump "$work/response.ofx" > "$work/dump.txt"
+head -40 "$work/dump.txt"
 echo "== the statement as CSV"
 "$ofxkit" statement "$work/response.ofx"
