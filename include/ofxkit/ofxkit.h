@@ -40,3 +40,14 @@
 #include "ofxkit/envelope/OETransBase.h"
 #include "ofxkit/envelope/OERequest.h"
 #include "ofxkit/envelope/OEFile.h"
+
+#include "ofxkit/net/OENet.h"
+
+#include "ofxkit/security/OESecStatus.h"
+#include "ofxkit/security/OESecToolkit.h"
+#include "ofxkit/security/OEKey.h"
+#include "ofxkit/security/OECipher.h"
+#include "ofxkit/security/OEDigest.h"
+#include "ofxkit/security/OECoding.h"
+#include "ofxkit/security/OECert.h"
+#include "ofxkit/security/OERC5.h"
