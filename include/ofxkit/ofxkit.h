@@ -42,6 +42,8 @@
 #include "ofxkit/envelope/OEFile.h"
 
 #include "ofxkit/net/OENet.h"
+#include "ofxkit/net/NCGateway.h"
+#include "ofxkit/net/GXNNet.h"
 
 #include "ofxkit/security/OESecStatus.h"
 #include "ofxkit/security/OESecToolkit.h"
