@@ -25,6 +25,8 @@ class Args {
   bool Flag(const std::string& name);  // --name present (and consumed)
   // The value of --name VALUE (or --name=VALUE); empty when absent.
   std::string Option(const std::string& name);
+  // Every value of a repeated --name VALUE, in order.
+  std::vector<std::string> Options(const std::string& name);
   bool HasOption(const std::string& name) const;
   // The remaining positional arguments; reports unknown options.
   std::vector<std::string> Positional(std::string* error);
@@ -78,5 +80,6 @@ int CmdDump(int argc, char** argv);
 int CmdStatement(int argc, char** argv);
 int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
+int CmdExchange(int argc, char** argv);
 
 }  // namespace cli

@@ -29,20 +29,25 @@ bool Args::HasOption(const std::string& name) const {
 }
 
 // One-letter options are written -o VALUE, longer ones --name VALUE or --name=VALUE.
-std::string Args::Option(const std::string& name) {
-  std::string value;
+std::vector<std::string> Args::Options(const std::string& name) {
+  std::vector<std::string> values;
   const std::string flag = (name.size() == 1 ? "-" : "--") + name;
   for (size_t i = 0; i < m_args.size(); ++i) {
     if (m_used[i]) continue;
     if (m_args[i] == flag && i + 1 < m_args.size()) {
-      value = m_args[i + 1];
+      values.push_back(m_args[i + 1]);
       m_used[i] = m_used[i + 1] = true;
     } else if (m_args[i].rfind(flag + "=", 0) == 0) {
-      value = m_args[i].substr(flag.size() + 1);
+      values.push_back(m_args[i].substr(flag.size() + 1));
       m_used[i] = true;
     }
   }
-  return value;
+  return values;
+}
+
+std::string Args::Option(const std::string& name) {
+  std::vector<std::string> values = Options(name);
+  return values.empty() ? std::string() : values.back();
 }
 
 std::vector<std::string> Args::Positional(std::string* error) {

@@ -15,6 +15,7 @@ const Command kCommands[] = {
     {"statement", cli::CmdStatement, "print the transactions of bank and card statements as CSV"},
     {"request", cli::CmdRequest, "write an OFX request file (request statement ...)"},
     {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
+    {"exchange", cli::CmdExchange, "post a request file to a server (http:, https:) and dump the reply"},
 };
 
 void Usage(FILE* out) {

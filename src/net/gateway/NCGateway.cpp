@@ -64,7 +64,7 @@ struct Transfer {
   bool started = false;
   uint16_t certVerdict = 0;
   curl_off_t sent = 0, toSend = 0, received = 0, toReceive = 0;
-  curl_off_t sentReported = -1, receivedReported = -1;
+  curl_off_t sentReported = 0, receivedReported = 0;  // nothing to report until bytes move
 
   ~Transfer() {
     if (easy) curl_easy_cleanup(easy);

@@ -1,0 +1,192 @@
+// ofxkit exchange: posts a request file to a server through the gateway
+// transport, saves the reply and dumps it.
+#include <algorithm>
+#include <cctype>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "cli.h"
+
+namespace cli {
+namespace {
+
+const char* const kExchangeHelp =
+    "usage: ofxkit exchange REQUEST URL [options]\n"
+    "Posts the OFX request file REQUEST to URL (http:, https:) and saves the reply, or reads\n"
+    "the reply from a file: URL. Prints where the reply went, then dumps it.\n"
+    "  -o FILE                 where the reply goes (default: REQUEST's name with -reply.ofx)\n"
+    "  --trust CERT[:ID]       trust the root certificate in CERT (DER or PEM) under root id\n"
+    "                          ID (1-4, default 1); may be repeated\n"
+    "  --expect-cert-id ID     accept only a server certificate with that identity (base64\n"
+    "                          SHA-1 of its DER); at most two\n"
+    "  --builtin-roots         trust the library's built-in roots\n"
+    "  --no-verify             do not verify the server's chain (roots and identities still apply)\n"
+    "  --timeout SECONDS       give up on a transfer after that long\n"
+    "  --quiet                 no progress line\n"
+    "  --verbose               print the transport's log lines on standard error\n"
+    "Exit status: as for dump, or 4 when the transfer failed.\n";
+
+constexpr int kTransferFailed = 4;
+
+bool g_verbose = false;
+bool g_progress = true;
+
+void PrintLogLine(const char* message, unsigned short level, const char*) {
+  if (g_verbose) std::fprintf(stderr, "[%u] %s\n", level, message);
+}
+
+// One line, rewritten in place while the transfer runs.
+void PrintProgress(OEOpCode op, void* a, void* b) {
+  if (!g_progress || (op != OE_OP_SEND_PROGRESS && op != OE_OP_RECEIVE_PROGRESS)) return;
+  auto done = static_cast<unsigned long>(reinterpret_cast<uintptr_t>(a));
+  auto total = static_cast<unsigned long>(reinterpret_cast<uintptr_t>(b));
+  const char* verb = op == OE_OP_SEND_PROGRESS ? "sent" : "received";
+  if (total)
+    std::fprintf(stderr, "\r%-8s %10lu of %lu bytes (%3lu%%)", verb, done, total, done * 100 / total);
+  else
+    std::fprintf(stderr, "\r%-8s %10lu bytes               ", verb, done);
+  std::fflush(stderr);
+}
+
+std::string DefaultReplyPath(const std::string& request) {
+  std::string base = request.substr(request.find_last_of('/') == std::string::npos ? 0 : request.find_last_of('/') + 1);
+  size_t dot = base.rfind('.');
+  if (dot != std::string::npos && dot > 0) base.resize(dot);
+  return base + "-reply.ofx";
+}
+
+// Adds the certificate in a file (DER, or PEM's base64) as a trusted root.
+bool TrustRoot(GXNNetRequest& request, const std::string& spec, std::string* error) {
+  std::string path = spec;
+  long id = OE_ROOT_VEXA_BRANDING;
+  size_t colon = spec.rfind(':');
+  if (colon != std::string::npos && colon + 2 == spec.size() && spec[colon + 1] >= '1' && spec[colon + 1] <= '4') {
+    path = spec.substr(0, colon);
+    id = spec[colon + 1] - '0';
+  }
+  OEBuffer file;
+  if (!ReadFile(path, file, error)) return false;
+  std::string text(file.GetBufferPtr() ? file.GetBufferPtr() : "", file.GetBufferSize());
+  unsigned short added;
+  size_t begin = text.find("-----BEGIN CERTIFICATE-----");
+  if (begin != std::string::npos) {
+    size_t start = text.find('\n', begin);
+    size_t end = text.find("-----END CERTIFICATE-----");
+    if (start == std::string::npos || end == std::string::npos || end < start) {
+      *error = path + ": not a certificate";
+      return false;
+    }
+    std::string base64;
+    for (size_t i = start; i < end; ++i)
+      if (!std::isspace(static_cast<unsigned char>(text[i]))) base64 += text[i];
+    added = base64.size() < 0xFFFF ? request.AddTrustedRoot(base64.data(), static_cast<unsigned short>(base64.size()),
+                                                             static_cast<OECallbackRootID>(id))
+                                   : 0;
+  } else {
+    added = text.size() < 0xFFFF ? request.AddTrustedRootBER(text.data(), static_cast<unsigned short>(text.size()),
+                                                             static_cast<OECallbackRootID>(id))
+                                 : 0;
+  }
+  if (!added) *error = path + ": not a certificate";
+  return added != 0;
+}
+
+}  // namespace
+
+int CmdExchange(int argc, char** argv) {
+  Args args(argc, argv, 2);
+  if (args.Flag("help")) {
+    std::fputs(kExchangeHelp, stdout);
+    return kClean;
+  }
+  std::vector<std::string> trusted = args.Options("trust");
+  std::vector<std::string> expected = args.Options("expect-cert-id");
+  bool builtIn = args.Flag("builtin-roots");
+  bool noVerify = args.Flag("no-verify");
+  g_progress = !args.Flag("quiet");
+  g_verbose = args.Flag("verbose");
+  std::string timeout = args.Option("timeout");
+  std::string output = args.Option("o");
+  std::string error;
+  std::vector<std::string> positional = args.Positional(&error);
+  if (!error.empty() || positional.size() != 2 || expected.size() > 2) {
+    std::fprintf(stderr, "ofxkit exchange: %s\n%s",
+                 !error.empty() ? error.c_str()
+                 : expected.size() > 2 ? "at most two --expect-cert-id"
+                                       : "expected REQUEST and URL",
+                 kExchangeHelp);
+    return kUsage;
+  }
+  const std::string& requestPath = positional[0];
+  const std::string& url = positional[1];
+  if (output.empty()) output = DefaultReplyPath(requestPath);
+
+  OEBuffer body;
+  if (!ReadFile(requestPath, body, &error)) {
+    std::fprintf(stderr, "ofxkit exchange: %s\n", error.c_str());
+    return kBadInput;
+  }
+  GXNNetAccess access;
+  access.SetLogCallback(PrintLogLine);
+  access.SetSessionCallback(PrintProgress);
+  OENetStatus status = access.InitConnection();
+  if (status != OE_NET_OK) {
+    std::fprintf(stderr, "ofxkit exchange: the network session could not be opened (netstatus %d)\n",
+                 static_cast<int>(status));
+    return kTransferFailed;
+  }
+  std::unique_ptr<GXNNetRequest> request(static_cast<GXNNetRequest*>(access.NewNetRequest()));
+  if (!request) return kTransferFailed;
+  for (const std::string& spec : trusted) {
+    if (!TrustRoot(*request, spec, &error)) {
+      std::fprintf(stderr, "ofxkit exchange: %s\n", error.c_str());
+      return kBadInput;
+    }
+  }
+  if (builtIn) {
+    request->AddVexariBrandingRoot();
+    request->AddRSAServerRoot();
+    request->AddVeriSignOFXCARoot();
+  }
+  for (const std::string& id : expected)
+    request->AddExpectedSSLCertID(id.data(), static_cast<unsigned short>(std::min<size_t>(id.size(), 0xFFFF)));
+  if (noVerify) request->SetSSLVerifyCert(0);
+  if (!timeout.empty()) request->SetTimeout(static_cast<int32_t>(std::strtol(timeout.c_str(), nullptr, 10)));
+
+  status = OENetRequest::HasFileScheme(url.c_str()) ? request->Get(OEString(url.c_str()))
+                                                     : request->Send(OEString(url.c_str()), &body);
+  if (g_progress) std::fputc('\n', stderr);
+  uint32_t http = 0, gatewayError = 0;
+  request->GetStatus(http, gatewayError);
+  OEBuffer reply;
+  if (status == OE_NET_OK) status = request->LoadReply(&reply);
+  access.DeleteNetRequest(request.release());
+  access.EndConnection();
+  if (status != OE_NET_OK) {
+    std::string http_text = gatewayError >= GX_ERR_HTTP_FIRST && gatewayError <= GX_ERR_HTTP_LAST
+                                ? ", HTTP " + std::to_string(http)
+                                : std::string();
+    std::fprintf(stderr, "ofxkit exchange: the transfer failed: netstatus %d (gateway error %u%s)\n",
+                 static_cast<int>(status), static_cast<unsigned>(gatewayError), http_text.c_str());
+    return kTransferFailed;
+  }
+  // The reply holds account data: private to the user.
+  if (!WriteFile(output, reply, &error, true)) {
+    std::fprintf(stderr, "ofxkit exchange: %s\n", error.c_str());
+    return kBadInput;
+  }
+  std::printf("reply: %s (%u bytes, HTTP %u)\n", output.c_str(), static_cast<unsigned>(reply.GetBufferSize()),
+              static_cast<unsigned>(http ? http : 200));
+  std::fflush(stdout);
+  char dump[] = "dump";
+  std::vector<char> path(output.begin(), output.end());
+  path.push_back('\0');
+  char* dumpArgs[] = {argv[0], dump, path.data(), nullptr};
+  return CmdDump(3, dumpArgs);
+}
+
+}  // namespace cli

@@ -1,0 +1,86 @@
+// A small HTTP/1.1 server on the loopback interface, plain or over TLS, for
+// `ofxkit serve` and for the transport tests. It is not part of the library:
+// it is test and demonstration equipment, bounded in requests and in time.
+#pragma once
+
+#include <atomic>
+#include <functional>
+#include <memory>
+#include <string>
+#include <thread>
+#include <utility>
+#include <vector>
+
+namespace loopback {
+
+struct HttpRequest {
+  std::string method;   // "GET", "POST", ...
+  std::string target;   // "/ofx", as sent
+  std::vector<std::pair<std::string, std::string>> headers;  // in order, values trimmed
+  std::string body;
+  // The first header of that name (case-insensitive), or "".
+  std::string Header(const std::string& name) const;
+};
+
+struct HttpResponse {
+  int status = 200;
+  std::string contentType = "application/x-ofx";
+  std::string body;
+  std::vector<std::pair<std::string, std::string>> extraHeaders;
+  // Read the request, then never answer (the connection stays open until
+  // the server stops): for timeout and cancel tests.
+  bool hang = false;
+};
+
+using Handler = std::function<HttpResponse(const HttpRequest&)>;
+
+// A certificate authority made in memory (RSA, SHA-256), and a server
+// certificate it issues for "localhost" and 127.0.0.1.
+class Authority {
+ public:
+  // organisation names the authority's subject O=; commonName its CN=.
+  static std::unique_ptr<Authority> Make(const std::string& organisation, const std::string& commonName,
+                                         std::string* error);
+  ~Authority();
+  const std::string& CaDER() const;      // the authority's certificate, DER
+  std::string CaPEM() const;
+  const std::string& ServerDER() const;  // the server's certificate, DER
+  struct Impl;
+  Impl* impl() const { return m_impl.get(); }
+
+ private:
+  Authority();
+  std::unique_ptr<Impl> m_impl;
+};
+
+struct ServerOptions {
+  bool https = false;
+  const Authority* authority = nullptr;  // required when https
+  int port = 0;                          // 0: any free port
+  int maxRequests = 0;                   // stop after that many requests; 0: no bound
+  int maxSeconds = 0;                    // stop after that long; 0: no bound
+};
+
+class Server {
+ public:
+  Server(ServerOptions options, Handler handler);
+  ~Server();  // stops and joins
+  // Binds 127.0.0.1 and listens; false with a message when it cannot.
+  bool Listen(std::string* error);
+  int Port() const;
+  // "http://127.0.0.1:PORT" or "https://127.0.0.1:PORT".
+  std::string BaseURL() const;
+  // Serves on the calling thread until Stop, maxRequests or maxSeconds.
+  void Run();
+  // Serves on a thread of its own (for tests).
+  void Start();
+  // Ends Run (from any thread) and joins the thread Start made.
+  void Stop();
+  int RequestsServed() const;
+
+ private:
+  struct Impl;
+  std::unique_ptr<Impl> m_impl;
+};
+
+}  // namespace loopback
