@@ -1,0 +1,1 @@
+#include "loopback_server.h"
