@@ -233,16 +233,15 @@ unsigned short GXNNetRequest::SetSSLOptions(NCHandle handle, const char* operati
 // ---- Transfers -------------------------------------------------------------
 
 OENetStatus GXNNetRequest::Get(const OEString& url) {
-  return RunTransfer(url, nullptr);
+  return RunTransfer(url, nullptr, false);
 }
 
 OENetStatus GXNNetRequest::Send(const OEString& url, OEBuffer* body) {
-  return RunTransfer(url, body);
+  return RunTransfer(url, body, true);
 }
 
-// A GET (body null) or a POST of body, from start to completion.
-OENetStatus GXNNetRequest::RunTransfer(const OEString& url, OEBuffer* body) {
-  const bool send = body != nullptr;
+// A GET, or a POST of body, from start to completion.
+OENetStatus GXNNetRequest::RunTransfer(const OEString& url, OEBuffer* body, bool send) {
   const std::string shown = LoggableURL(url.c_str());
   Log(1, send ? "GXN: Beginning send to %s" : "GXN: Beginning get from %s", shown.c_str());
   m_handle = 0;
@@ -254,7 +253,7 @@ OENetStatus GXNNetRequest::RunTransfer(const OEString& url, OEBuffer* body) {
   }
 
   OENetStatus status = OE_NET_OK;
-  if (!m_access) {
+  if (!m_access || (send && !body)) {
     status = OE_NET_REQUEST_FAILED;
   } else {
     const GXNGateway& gateway = m_access->Gateway();

@@ -54,6 +54,7 @@ class Authority {
 };
 
 struct ServerOptions {
+  std::string host = "127.0.0.1";       // a loopback address to bind
   bool https = false;
   const Authority* authority = nullptr;  // required when https
   int port = 0;                          // 0: any free port
@@ -65,10 +66,10 @@ class Server {
  public:
   Server(ServerOptions options, Handler handler);
   ~Server();  // stops and joins
-  // Binds 127.0.0.1 and listens; false with a message when it cannot.
+  // Binds options.host and listens; false with a message when it cannot.
   bool Listen(std::string* error);
   int Port() const;
-  // "http://127.0.0.1:PORT" or "https://127.0.0.1:PORT".
+  // "http://HOST:PORT" or "https://HOST:PORT".
   std::string BaseURL() const;
   // Serves on the calling thread until Stop, maxRequests or maxSeconds.
   void Run();

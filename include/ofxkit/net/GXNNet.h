@@ -129,7 +129,7 @@ class GXNNetRequest : public OENetRequest {
   unsigned short CheckCertificate(SSLCertificateChain* chain, unsigned long rootID, unsigned short error);
 
  private:
-  OENetStatus RunTransfer(const OEString& url, OEBuffer* body);
+  OENetStatus RunTransfer(const OEString& url, OEBuffer* body, bool send);
   void Log(unsigned short level, const char* format, ...) __attribute__((format(printf, 3, 4)));
   void RemoveReplyFiles();
   unsigned short AddRoot(const char* data, unsigned short length, OECallbackRootID id, bool encoded);

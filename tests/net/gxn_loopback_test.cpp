@@ -1,0 +1,278 @@
+// Whole transfers through the libcurl gateway against servers on the
+// loopback interface: HTTP and HTTPS, certificate acceptance and refusal,
+// HTTP errors, servers that never answer, and the temporary files.
+#include <dirent.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <cstring>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <vector>
+
+#include "loopback_server.h"
+#include "ofxkit/net/GXNNet.h"
+#include "ofxkit/security/OECert.h"
+
+namespace {
+
+std::vector<std::string> g_lines;
+void Record(const char* text, unsigned short, const char*) { g_lines.push_back(text); }
+
+// What the server saw of the last request.
+struct Seen {
+  std::mutex lock;
+  std::string method, contentType, body;
+};
+
+class Loopback : public ::testing::Test {
+ protected:
+  static void SetUpTestSuite() {
+    std::string error;
+    authority = loopback::Authority::Make("ofxkit tests", "ofxkit test root", &error).release();
+    ASSERT_NE(authority, nullptr) << error;
+  }
+  static void TearDownTestSuite() {
+    delete authority;
+    authority = nullptr;
+  }
+
+  void SetUp() override {
+    g_lines.clear();
+    char pattern[] = "/tmp/ofxkit-net-XXXXXX";
+    ASSERT_NE(mkdtemp(pattern), nullptr);
+    folder = pattern;
+    access.SetTempFilePath(OEString(folder.c_str()));
+    access.SetLogCallback(Record);
+    ASSERT_EQ(access.InitConnection(), OE_NET_OK);
+    request.reset(static_cast<GXNNetRequest*>(access.NewNetRequest()));
+  }
+  void TearDown() override {
+    request.reset();
+    EXPECT_EQ(access.EndConnection(), OE_NET_OK);
+    if (server) server->Stop();
+    EXPECT_TRUE(Files().empty()) << "temporary files left behind";
+    rmdir(folder.c_str());
+  }
+
+  // Starts a server answering with handler (or with an echo of the body).
+  void Serve(bool https, loopback::Handler handler = nullptr, const char* host = "127.0.0.1") {
+    loopback::ServerOptions options;
+    options.host = host;
+    options.https = https;
+    options.authority = authority;
+    options.maxSeconds = 30;
+    options.maxRequests = 10;
+    if (!handler) {
+      handler = [this](const loopback::HttpRequest& rq) {
+        std::lock_guard<std::mutex> guard(seen.lock);
+        seen.method = rq.method;
+        seen.contentType = rq.Header("content-type");
+        seen.body = rq.body;
+        loopback::HttpResponse rs;
+        rs.body = rq.method == "POST" ? "<OFX>echo " + rq.body + "</OFX>" : "<OFX>got " + rq.target + "</OFX>";
+        rs.extraHeaders.push_back({"X-Reply", "yes"});
+        return rs;
+      };
+    }
+    server.reset(new loopback::Server(options, handler));
+    std::string error;
+    ASSERT_TRUE(server->Listen(&error)) << error;
+    server->Start();
+  }
+  std::string URL(const char* path = "/ofx") const { return server->BaseURL() + path; }
+
+  std::vector<std::string> Files() const {
+    std::vector<std::string> names;
+    if (DIR* d = opendir(folder.c_str())) {
+      while (dirent* e = readdir(d))
+        if (e->d_name[0] != '.') names.push_back(folder + "/" + e->d_name);
+      closedir(d);
+    }
+    return names;
+  }
+  bool Logged(const std::string& text) const {
+    for (const std::string& l : g_lines)
+      if (l == text) return true;
+    return false;
+  }
+  OENetStatus Send(const std::string& url, const char* text = "<OFX>request</OFX>") {
+    OEBuffer body;
+    body.WriteLarge(text, static_cast<uint32_t>(std::strlen(text)));
+    return request->Send(OEString(url.c_str()), &body);
+  }
+  std::string Reply() {
+    OEBuffer reply;
+    EXPECT_EQ(request->LoadReply(&reply), OE_NET_OK);
+    return std::string(reply.GetBufferPtr() ? reply.GetBufferPtr() : "", reply.GetBufferSize());
+  }
+  unsigned short TrustAuthority(OECallbackRootID id) {
+    const std::string& der = authority->CaDER();
+    return request->AddTrustedRootBER(der.data(), static_cast<unsigned short>(der.size()), id);
+  }
+  std::string ServerCertID() {
+    OEBuffer der;
+    der.WriteLarge(authority->ServerDER().data(), static_cast<uint32_t>(authority->ServerDER().size()));
+    OECertID id;
+    EXPECT_EQ(id.SetCertBER(&der), OE_SEC_OK);
+    const OEBuffer* text = id.GetEncodedCertIDPtr();
+    return std::string(text->GetBufferPtr(), text->GetBufferSize());
+  }
+
+  static loopback::Authority* authority;
+  std::string folder;
+  GXNNetAccess access;
+  std::unique_ptr<GXNNetRequest> request;
+  std::unique_ptr<loopback::Server> server;
+  Seen seen;
+};
+loopback::Authority* Loopback::authority = nullptr;
+
+TEST_F(Loopback, HttpPostAndGetRoundTrips) {
+  Serve(false);
+  request->SetSaveHeaders(1);
+  ASSERT_EQ(Send(URL()), OE_NET_OK);
+  // The reply waits in private files until it is read.
+  std::vector<std::string> files = Files();
+  ASSERT_EQ(files.size(), 2u);
+  for (const std::string& f : files) {
+    struct stat info;
+    ASSERT_EQ(stat(f.c_str(), &info), 0);
+    EXPECT_EQ(info.st_mode & 0777, 0600u) << f;
+  }
+  uint32_t size = 0, http = 0, error = 0;
+  EXPECT_EQ(request->GetReplySize(size), OE_NET_OK);
+  EXPECT_EQ(request->GetStatus(http, error), 1);
+  EXPECT_EQ(http, 200u);
+  OEString name("X-Reply"), value;
+  EXPECT_EQ(request->GetHeader(name, value), 1);
+  EXPECT_STREQ(value.c_str(), " yes\r");
+  EXPECT_EQ(Reply(), "<OFX>echo <OFX>request</OFX></OFX>");
+  EXPECT_EQ(size, 34u);
+  {
+    std::lock_guard<std::mutex> guard(seen.lock);
+    EXPECT_EQ(seen.method, "POST");
+    EXPECT_EQ(seen.contentType, "application/x-ofx");
+  }
+
+  ASSERT_EQ(request->Get(OEString(URL("/file.ofx").c_str())), OE_NET_OK);
+  EXPECT_EQ(Reply(), "<OFX>got /file.ofx</OFX>");
+
+  // With a timeout the content type is set explicitly; a body of a few
+  // hundred kilobytes goes through whole.
+  request->SetTimeout(20);
+  std::string big(300000, 'x');
+  ASSERT_EQ(Send(URL(), big.c_str()), OE_NET_OK);
+  EXPECT_EQ(Reply().size(), big.size() + 16);
+  std::lock_guard<std::mutex> guard(seen.lock);
+  EXPECT_EQ(seen.contentType, "application/x-ofx");
+  EXPECT_EQ(seen.body.size(), big.size());
+}
+
+TEST_F(Loopback, HttpErrorsAndUnreachableServers) {
+  Serve(false, [](const loopback::HttpRequest&) {
+    loopback::HttpResponse rs;
+    rs.status = 404;
+    rs.body = "no such service";
+    return rs;
+  });
+  EXPECT_EQ(Send(URL()), OE_NET_HTTP_CLIENT_ERROR);
+  uint32_t http = 0, error = 0;
+  EXPECT_EQ(request->GetStatus(http, error), 1);
+  EXPECT_EQ(http, 404u);
+  EXPECT_EQ(error, 1513u);
+  EXPECT_TRUE(Logged("***GXN kGXFInished: returns 1513"));
+  uint32_t size = 0;
+  EXPECT_EQ(request->GetReplySize(size), OE_NET_NO_REPLY_SIZE);
+
+  // Nobody listens on the port once the server is gone.
+  std::string url = URL();
+  server->Stop();
+  EXPECT_EQ(Send(url), OE_NET_NOT_CONNECTED);
+}
+
+TEST_F(Loopback, HttpsAcceptedOnlyUnderATrustedRoot) {
+  Serve(true);
+  // The test authority is unknown to the system: the chain does not verify.
+  EXPECT_EQ(Send(URL()), OE_NET_CERT_REJECTED);
+  EXPECT_TRUE(Logged("***GXN: SSL certificate error: 1670"));
+
+  ASSERT_EQ(TrustAuthority(OE_ROOT_VEXA_BRANDING), 1);
+  g_lines.clear();
+  ASSERT_EQ(Send(URL()), OE_NET_OK);
+  EXPECT_TRUE(Logged("GXN: Received trusted root 1 (Vexari Branding CA)"));
+  EXPECT_EQ(Reply(), "<OFX>echo <OFX>request</OFX></OFX>");
+
+  // The server's certificate names 127.0.0.1 and localhost, nothing else.
+  server->Stop();
+  Serve(true, nullptr, "127.0.0.2");
+  std::string other = URL();
+  EXPECT_EQ(Send(other), OE_NET_CERT_ERROR_1673);
+  // With verification off the name is not checked, but roots still are.
+  request->SetSSLVerifyCert(0);
+  EXPECT_EQ(Send(other), OE_NET_OK);
+  Reply();
+}
+
+TEST_F(Loopback, HttpsExpectedIdentityAndRefusedRoots) {
+  Serve(true);
+  ASSERT_EQ(TrustAuthority(OE_ROOT_VERISIGN_OFX_CA), 1);
+  const std::string id = ServerCertID();
+  ASSERT_EQ(request->AddExpectedSSLCertID("AAAAAAAAAAAAAAAAAAAAAAAAAAA=", 28), 1);
+  EXPECT_EQ(Send(URL()), OE_NET_CERT_REJECTED);
+  EXPECT_TRUE(Logged("***GXN: SSL Cert ID failure: Expecting \"AAAAAAAAAAAAAAAAAAAAAAAAAAA=\", received \"" + id +
+                     "\""));
+  ASSERT_EQ(request->AddExpectedSSLCertID(id.data(), static_cast<unsigned short>(id.size())), 1);
+  ASSERT_EQ(Send(URL()), OE_NET_OK);
+  EXPECT_TRUE(Logged("GXN: Received trusted root 2 (VeriSign OFX CA)"));
+  Reply();
+
+  // The same authority added as the Class 3 primary authority is refused.
+  request.reset(static_cast<GXNNetRequest*>(access.NewNetRequest()));
+  ASSERT_EQ(TrustAuthority(OE_ROOT_VERISIGN_CLASS3), 1);
+  g_lines.clear();
+  EXPECT_EQ(Send(URL()), OE_NET_OTHER_ERROR);
+  EXPECT_TRUE(Logged("***GXN: VeriSign Class 3 PCA is not accepted as a trusted root."));
+  uint32_t http = 0, error = 0;
+  request->GetStatus(http, error);
+  EXPECT_EQ(error, 1671u);
+}
+
+GXNNetRequest* g_request;
+std::chrono::steady_clock::time_point g_abortAt;
+GXNWaitAction AbortWhenDue(void*) {
+  if (std::chrono::steady_clock::now() >= g_abortAt) g_request->Abort();
+  return GXN_WAIT_CONTINUE;
+}
+GXNWaitAction QuitWhenDue(void*) {
+  return std::chrono::steady_clock::now() >= g_abortAt ? GXN_WAIT_QUIT : GXN_WAIT_CONTINUE;
+}
+
+TEST_F(Loopback, ServerThatNeverAnswers) {
+  Serve(false, [](const loopback::HttpRequest&) {
+    loopback::HttpResponse rs;
+    rs.hang = true;
+    return rs;
+  });
+  using Clock = std::chrono::steady_clock;
+  auto start = Clock::now();
+  request->SetTimeout(1);
+  EXPECT_EQ(Send(URL()), OE_NET_TIMEOUT);
+  EXPECT_LT(Clock::now() - start, std::chrono::seconds(10));
+
+  // No timeout: the application's wait hook ends it.
+  request->SetTimeout(0);
+  g_request = request.get();
+  g_abortAt = Clock::now() + std::chrono::milliseconds(300);
+  access.SetWaitHook(AbortWhenDue, nullptr);
+  EXPECT_EQ(request->Get(OEString(URL().c_str())), OE_NET_OTHER_ERROR);
+  g_abortAt = Clock::now() + std::chrono::milliseconds(300);
+  access.SetWaitHook(QuitWhenDue, nullptr);
+  EXPECT_EQ(Send(URL()), OE_NET_OTHER_ERROR);
+  EXPECT_LT(Clock::now() - start, std::chrono::seconds(20));
+}
+
+}  // namespace
