@@ -10,33 +10,9 @@
 #include <string>
 
 #include "ofxkit/ofxkit.h"
+#include "statement_text.h"
 
 namespace {
-std::string LoadStatement() {
-  std::string text;
-  const char* path = std::getenv("OFXKIT_BENCH_FILE");
-  FILE* f = nullptr;
-  bool piped = false;
-  if (path) {
-    f = std::fopen(path, "rb");
-  } else {
-    f = popen("python3 " OFXKIT_SHARED_DIR "/tools/gen_statement.py 17000 2>/dev/null", "r");
-    piped = true;
-  }
-  if (!f) return text;
-  char chunk[65536];
-  size_t n;
-  while ((n = std::fread(chunk, 1, sizeof chunk, f)) > 0) text.append(chunk, n);
-  if (piped) pclose(f);
-  else std::fclose(f);
-  return text;
-}
-
-const std::string& Statement() {
-  static const std::string text = LoadStatement();
-  return text;
-}
-
 void FillBuffer(OEBuffer& buffer, const std::string& text) {
   buffer.SetBufferOffset(0);
   buffer.WriteLarge(text.data(), static_cast<uint32_t>(text.size()));
