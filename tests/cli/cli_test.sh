@@ -7,11 +7,13 @@ ofxkit="$1"
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 failures=0
+checks=0
 check() {  # check DESCRIPTION EXPECTED ACTUAL
+  checks=$((checks + 1))
   if [ "$2" = "$3" ]; then echo "ok   $1"; else echo "FAIL $1: expected '$2', got '$3'"; failures=$((failures + 1)); fi
 }
 
-for cmd in dump statement respond "request statement"; do
+for cmd in dump statement respond "request statement" exchange serve; do
   $ofxkit $cmd --help > "$work/help" 2>&1
   check "help of $cmd" "0 yes" "$? $(grep -q usage "$work/help" && echo yes)"
 done
@@ -58,5 +60,28 @@ echo "plain text" > "$work/text.txt"
 $ofxkit statement "$work/text.txt" > /dev/null 2>&1
 check "not OFX" 3 $?
 
-echo "$((28 - failures)) passed, $failures failed"
+# A statement download over HTTPS from `ofxkit serve`, trusting its authority.
+$ofxkit serve --cert-out "$work/ca.der" > /dev/null 2>&1
+check "--cert-out needs --https" 64 $?
+echo "pa55word" | $ofxkit serve --https --cert-out "$work/ca.der" --ready-file "$work/url" --max-requests 2 \
+  --max-seconds 60 --user alice --password-stdin --transactions 4 > "$work/serve.out" 2> "$work/serve.log" &
+server=$!
+for _ in $(seq 100); do [ -s "$work/url" ] && break; sleep 0.1; done
+url=$(cat "$work/url" 2> /dev/null)
+check "server announces its URL" "listening on $url" "$(cat "$work/serve.out")"
+$ofxkit exchange "$work/rq.ofx" "$url" -o "$work/untrusted.ofx" > /dev/null 2> "$work/untrusted.err"
+check "unknown authority refused" "4 1670" "$? $(grep -o 'gateway error [0-9]*' "$work/untrusted.err" | cut -d' ' -f3)"
+$ofxkit exchange "$work/rq.ofx" "$url" --trust "$work/ca.der" -o "$work/net.ofx" > "$work/net.txt" 2> /dev/null
+check "download over HTTPS" 0 $?
+check "reply saved privately" 600 "$(stat -c %a "$work/net.ofx")"
+check "downloaded statement has its transactions" 4 "$(grep -c '^<STMTTRN>' "$work/net.ofx")"
+sed 's/^<USERPASS>.*/<USERPASS>wrong/' "$work/rq.ofx" > "$work/badpass.ofx"
+$ofxkit exchange "$work/badpass.ofx" "$url" --trust "$work/ca.der" -o "$work/denied-net.ofx" > /dev/null 2>&1
+check "bad credentials over HTTPS get 15500" 1 "$(grep -c '<CODE>15500' "$work/denied-net.ofx")"
+wait "$server"
+check "server ends after its requests" 0 $?
+check "server logs each request" 2 "$(grep -c '^POST / 200 [0-9]* bytes$' "$work/serve.log")"
+check "no password in the server's output" 0 "$(cat "$work/serve.out" "$work/serve.log" | grep -c pa55word)"
+
+echo "$((checks - failures)) passed, $failures failed"
 [ "$failures" -eq 0 ]

@@ -50,6 +50,8 @@ bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* err
 // Parses an OFX file (request or response, told from its message sets).
 // Returns kBadInput with a message for what is not OFX at all.
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error);
+// The same for a file already in memory; name is used in messages.
+int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error);
 int ExitForStatus(OEParseStatus status);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
@@ -69,17 +71,27 @@ bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserP
 struct RespondOptions {
   unsigned transactions = 25;
   bool checkCredentials = false;
+  bool passwordFromStdin = false;
   std::string user;
   OEUserPassword password;
 };
 // Fills response with the answer to request; false when the credentials did
 // not match (the response then says so).
 bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFileRs& response);
+// Reads --transactions, --user and --password-stdin; false after a message on
+// standard error when they are not usable.
+bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options);
+// With a user named, reads the password (from the terminal without echo, or
+// a line of standard input); false after a message when none is given.
+bool AskPassword(const char* command, RespondOptions& options);
+// Answers request and writes the response file into out; the build status.
+OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out);
 
 int CmdDump(int argc, char** argv);
 int CmdStatement(int argc, char** argv);
 int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
 int CmdExchange(int argc, char** argv);
+int CmdServe(int argc, char** argv);
 
 }  // namespace cli

@@ -135,8 +135,12 @@ int ExitForStatus(OEParseStatus status) {
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error) {
   OEBuffer buffer;
   if (!ReadFile(path, buffer, error)) return kBadInput;
+  return ParseOFXBuffer(buffer, path, parsed, error);
+}
+
+int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error) {
   if (!Contains(buffer, "<OFX>")) {
-    *error = path + ": not an OFX file (no <OFX> aggregate)";
+    *error = name + ": not an OFX file (no <OFX> aggregate)";
     return kBadInput;
   }
   parsed.isResponse = Contains(buffer, "MSGSRSV1>") || !Contains(buffer, "MSGSRQV1>");

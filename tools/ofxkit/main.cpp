@@ -16,6 +16,7 @@ const Command kCommands[] = {
     {"request", cli::CmdRequest, "write an OFX request file (request statement ...)"},
     {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
     {"exchange", cli::CmdExchange, "post a request file to a server (http:, https:) and dump the reply"},
+    {"serve", cli::CmdServe, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
 };
 
 void Usage(FILE* out) {

@@ -149,43 +149,64 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
   return signedOn;
 }
 
+bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options) {
+  std::string count = args.Option("transactions");
+  if (!count.empty()) {
+    char* end = nullptr;
+    unsigned long n = std::strtoul(count.c_str(), &end, 10);
+    if (*end || n > 60000) {
+      std::fprintf(stderr, "ofxkit %s: --transactions takes a number up to 60000\n", command);
+      return false;
+    }
+    options.transactions = static_cast<unsigned>(n);
+  }
+  options.user = args.Option("user");
+  options.passwordFromStdin = args.Flag("password-stdin");
+  return true;
+}
+
+bool AskPassword(const char* command, RespondOptions& options) {
+  if (options.user.empty()) return true;
+  options.checkCredentials = true;
+  if (!PromptPassword(options.passwordFromStdin ? "" : "Password: ", options.password)) {
+    std::fprintf(stderr, "ofxkit %s: no password given\n", command);
+    return false;
+  }
+  return true;
+}
+
+OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out) {
+  OEFileRs response;
+  AnswerRequest(request, options, response);
+  OEBuilder builder;
+  return builder.Build(&out, &response, OE_BUILD_STRICT, 1);
+}
+
 int CmdRespond(int argc, char** argv) {
   Args args(argc, argv, 2);
   if (args.Flag("help")) {
     std::fputs(kRespondHelp, stdout);
     return kClean;
   }
-  RespondOptions options;
-  std::string count = args.Option("transactions");
-  if (!count.empty()) options.transactions = static_cast<unsigned>(std::strtoul(count.c_str(), nullptr, 10));
-  options.user = args.Option("user");
-  bool passwordFromStdin = args.Flag("password-stdin");
   std::string output = args.Option("o");
   std::string error;
+  RespondOptions options;
+  if (!ReadRespondOptions(args, "respond", options)) return kUsage;
   std::vector<std::string> files = args.Positional(&error);
-  if (!error.empty() || files.size() != 1 || options.transactions > 60000) {
+  if (!error.empty() || files.size() != 1) {
     std::fprintf(stderr, "ofxkit respond: %s\n%s", error.empty() ? "expected one REQUEST file" : error.c_str(),
                  kRespondHelp);
     return kUsage;
   }
-  if (!options.user.empty()) {
-    options.checkCredentials = true;
-    if (!PromptPassword(passwordFromStdin ? "" : "Password: ", options.password)) {
-      std::fprintf(stderr, "ofxkit respond: no password given\n");
-      return kUsage;
-    }
-  }
+  if (!AskPassword("respond", options)) return kUsage;
   ParsedFile parsed;
   int rc = ParseOFXFile(files[0], parsed, &error);
   if (rc == kBadInput || parsed.isResponse) {
     std::fprintf(stderr, "ofxkit respond: %s\n", rc == kBadInput ? error.c_str() : "not a request file");
     return kBadInput;
   }
-  OEFileRs response;
-  AnswerRequest(*static_cast<OEFileRq*>(parsed.file.get()), options, response);
   OEBuffer out(0, 1u << 16);
-  OEBuilder builder;
-  OEBuildStatus status = builder.Build(&out, &response, OE_BUILD_STRICT, 1);
+  OEBuildStatus status = WriteAnswer(*static_cast<OEFileRq*>(parsed.file.get()), options, out);
   if (status != OE_BUILD_OK) {
     std::fprintf(stderr, "ofxkit respond: the response could not be written (build status %d)\n",
                  static_cast<int>(status));

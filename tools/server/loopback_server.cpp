@@ -514,9 +514,11 @@ void Server::Start() {
 }
 
 void Server::Stop() {
-  m_impl->stopping.store(true);
+  RequestStop();
   if (m_impl->thread.joinable() && m_impl->thread.get_id() != std::this_thread::get_id()) m_impl->thread.join();
 }
+
+void Server::RequestStop() { m_impl->stopping.store(true); }
 
 int Server::RequestsServed() const { return m_impl->served.load(); }
 

@@ -77,6 +77,8 @@ class Server {
   void Start();
   // Ends Run (from any thread) and joins the thread Start made.
   void Stop();
+  // Asks Run to end soon, without waiting: safe in a signal handler.
+  void RequestStop();
   int RequestsServed() const;
 
  private:
