@@ -6,10 +6,14 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <ctime>
 #include <string>
 #include <vector>
 
+#include <openssl/x509.h>
+
 #include "ofxkit/net/OENet.h"
+#include "ofxkit/security/OECert.h"
 #include "ofxkit/types/OECommon.h"
 
 namespace {
@@ -25,9 +29,7 @@ class RecordingRequest : public OENetRequest {
   unsigned short AddExpectedSSLCertID(const char*, unsigned short) override { return 0; }
   unsigned short AddExpectedSSLCertName(const OEString&) override { return 0; }
   OENetStatus Send(const OEString&, OEBuffer*) override { return OE_NET_UNSUPPORTED_URL; }
-  static bool CarriesRoot(OECallbackRootID id) {
-    const char* data = nullptr;
-    unsigned short length = 0;
+  static bool BuiltInRoot(OECallbackRootID id, const char*& data, unsigned short& length) {
     return GetBuiltInRoot(id, data, length) != 0;
   }
 
@@ -241,28 +243,67 @@ TEST(OENetRequestBase, AnswersOfTheBaseTransport) {
 
 TEST(OENetRequestBase, BuiltInRootsAreOfferedInOrder) {
   RecordingRequest request;
-  bool carried = RecordingRequest::CarriesRoot(OE_ROOT_VERISIGN_OFX_CA);
   // The primary authority follows the OFX CA only when the CA was accepted.
   request.refuse = OE_ROOT_VERISIGN_OFX_CA;
   EXPECT_EQ(request.AddVeriSignOFXCARoot(), 0);
-  std::vector<OECallbackRootID> refused;
-  if (carried) refused.push_back(OE_ROOT_VERISIGN_OFX_CA);
-  EXPECT_EQ(request.offered, refused);
+  EXPECT_EQ(request.offered, std::vector<OECallbackRootID>({OE_ROOT_VERISIGN_OFX_CA}));
 
   request.offered.clear();
   request.refuse = OE_ROOT_NONE;
-  unsigned short added = request.AddVeriSignOFXCARoot();
-  if (carried) {
-    EXPECT_EQ(added, RecordingRequest::CarriesRoot(OE_ROOT_VERISIGN_CLASS3) ? 1 : 0);
-    EXPECT_EQ(request.offered.front(), OE_ROOT_VERISIGN_OFX_CA);
-  } else {
-    // A build without the certificates refuses without offering anything.
-    EXPECT_EQ(added, 0);
-    EXPECT_TRUE(request.offered.empty());
+  EXPECT_EQ(request.AddVeriSignOFXCARoot(), 1);
+  EXPECT_EQ(request.AddVexariBrandingRoot(), 1);
+  EXPECT_EQ(request.AddRSAServerRoot(), 1);
+  EXPECT_EQ(request.offered, std::vector<OECallbackRootID>({OE_ROOT_VERISIGN_OFX_CA, OE_ROOT_VERISIGN_CLASS3,
+                                                             OE_ROOT_VEXA_BRANDING, OE_ROOT_RSA_SECURE_SERVER}));
+}
+
+time_t Day(int year, int month, int day) {
+  std::tm t{};
+  t.tm_year = year - 1900;
+  t.tm_mon = month - 1;
+  t.tm_mday = day;
+  return timegm(&t);
+}
+
+TEST(OENetRequestBase, BuiltInRootsAreTheRightCertificates) {
+  struct Expected {
+    OECallbackRootID id;
+    const char* organisation;
+    time_t start, end;
+  };
+  const Expected roots[] = {
+      {OE_ROOT_VEXA_BRANDING, "Vexari Inc.", Day(1997, 9, 3), Day(2002, 9, 3)},
+      {OE_ROOT_VERISIGN_OFX_CA, "VeriSign, Inc.", Day(1997, 7, 10), Day(2002, 7, 11)},
+      {OE_ROOT_VERISIGN_CLASS3, "VeriSign, Inc.", Day(1996, 1, 29), Day(2004, 1, 8)},
+      {OE_ROOT_RSA_SECURE_SERVER, "RSA Data Security, Inc.", Day(1994, 11, 9), Day(2010, 1, 8)},
+  };
+  X509* certs[5] = {};
+  for (const Expected& root : roots) {
+    SCOPED_TRACE(root.id);
+    const char* data = nullptr;
+    unsigned short length = 0;
+    ASSERT_TRUE(RecordingRequest::BuiltInRoot(root.id, data, length));
+    OECert cert;
+    ASSERT_EQ(cert.SetCertBER(data, length), OE_SEC_OK);
+    EXPECT_STREQ(cert.GetSubjectName().c_str(), root.organisation);
+    EXPECT_EQ(cert.GetStartDate(), root.start);
+    // Validity ends on the day named, at midnight or the second before the next.
+    EXPECT_LE(cert.GetEndDate(), root.end);
+    EXPECT_GT(cert.GetEndDate(), root.end - 86400);
+    const unsigned char* p = reinterpret_cast<const unsigned char*>(data);
+    certs[root.id] = d2i_X509(nullptr, &p, length);
+    ASSERT_NE(certs[root.id], nullptr);
   }
-  request.offered.clear();
-  EXPECT_EQ(request.AddVexariBrandingRoot(), RecordingRequest::CarriesRoot(OE_ROOT_VEXA_BRANDING) ? 1 : 0);
-  EXPECT_EQ(request.AddRSAServerRoot(), RecordingRequest::CarriesRoot(OE_ROOT_RSA_SECURE_SERVER) ? 1 : 0);
+  // The OFX CA is issued by the Class 3 authority and signed with its key;
+  // the others sign themselves.
+  X509* ofxCA = certs[OE_ROOT_VERISIGN_OFX_CA];
+  X509* class3 = certs[OE_ROOT_VERISIGN_CLASS3];
+  EXPECT_EQ(X509_NAME_cmp(X509_get_issuer_name(ofxCA), X509_get_subject_name(class3)), 0);
+  EXPECT_EQ(X509_verify(ofxCA, X509_get0_pubkey(class3)), 1);
+  EXPECT_NE(X509_verify(ofxCA, X509_get0_pubkey(ofxCA)), 1);
+  for (OECallbackRootID self : {OE_ROOT_VEXA_BRANDING, OE_ROOT_VERISIGN_CLASS3, OE_ROOT_RSA_SECURE_SERVER})
+    EXPECT_EQ(X509_verify(certs[self], X509_get0_pubkey(certs[self])), 1) << self;
+  for (X509* cert : certs) X509_free(cert);
 }
 
 TEST_F(NetFiles, RequestWrittenToFileUrlReadsBack) {
