@@ -55,6 +55,7 @@ class Loopback : public ::testing::Test {
     EXPECT_EQ(access.EndConnection(), OE_NET_OK);
     if (server) server->Stop();
     EXPECT_TRUE(Files().empty()) << "temporary files left behind";
+    for (const std::string& line : g_lines) EXPECT_EQ(line.find("pa55word"), std::string::npos) << line;
     rmdir(folder.c_str());
   }
 
@@ -179,7 +180,10 @@ TEST_F(Loopback, HttpErrorsAndUnreachableServers) {
     rs.body = "no such service";
     return rs;
   });
-  EXPECT_EQ(Send(URL()), OE_NET_HTTP_CLIENT_ERROR);
+  // Credentials in the address and in the body stay out of the log.
+  std::string withUser = "http://alice:pa55word@" + URL().substr(7);
+  EXPECT_EQ(Send(withUser, "<OFX><USERPASS>pa55word</OFX>"), OE_NET_HTTP_CLIENT_ERROR);
+  EXPECT_TRUE(Logged("GXN: Beginning send to http://alice:(hidden)@" + URL().substr(7)));
   uint32_t http = 0, error = 0;
   EXPECT_EQ(request->GetStatus(http, error), 1);
   EXPECT_EQ(http, 404u);
