@@ -83,5 +83,39 @@ check "server ends after its requests" 0 $?
 check "server logs each request" 2 "$(grep -c '^POST / 200 [0-9]* bytes$' "$work/serve.log")"
 check "no password in the server's output" 0 "$(cat "$work/serve.out" "$work/serve.log" | grep -c pa55word)"
 
+# The same server over plain HTTP: what it refuses, what its log keeps out,
+# and a clean stop on SIGTERM.
+status_of() {  # status_of URL [BODY-FILE]: the HTTP status of a GET, or of a POST of the file
+  python3 - "$@" <<'PY'
+import sys, urllib.request, urllib.error
+data = open(sys.argv[2], "rb").read() if len(sys.argv) > 2 else None
+try:
+    opener = urllib.request.build_opener(urllib.request.ProxyHandler({}))  # loopback: never a proxy
+    print(opener.open(urllib.request.Request(sys.argv[1], data=data), timeout=20).status)
+except urllib.error.HTTPError as e:
+    print(e.code)
+PY
+}
+$ofxkit serve --ready-file "$work/url2" --max-seconds 60 > /dev/null 2> "$work/serve2.log" &
+server=$!
+for _ in $(seq 100); do [ -s "$work/url2" ] && break; sleep 0.1; done
+url=$(cat "$work/url2" 2> /dev/null)
+$ofxkit exchange "$work/rq.ofx" "$url" -o "$work/plain.ofx" > /dev/null 2>&1
+check "download over HTTP" 0 $?
+check "GET refused" 405 "$(status_of "$url")"
+echo "hello" > "$work/hello.txt"
+check "not OFX refused" 400 "$(status_of "${url}ofx?password=pa55word" "$work/hello.txt")"
+check "response file refused" 400 "$(status_of "$url" "$work/plain.ofx")"
+head -c 4100000 /dev/zero | tr '\0' x > "$work/big"
+check "body larger than a buffer refused" 413 "$(status_of "$url" "$work/big")"
+kill -TERM "$server"; wait "$server"
+check "SIGTERM: clean exit" 0 $?
+check "ready file removed" no "$([ -e "$work/url2" ] && echo yes || echo no)"
+check "query strings not logged" "POST /ofx?... 400" "$(grep -o '^POST /ofx?\.\.\. 400' "$work/serve2.log")"
+check "no password in the request log" 0 "$(grep -c pa55word "$work/serve2.log")"
+$ofxkit serve --port 70000 > /dev/null 2>&1; check "bad port" 64 $?
+$ofxkit serve --transactions 60001 > /dev/null 2>&1; check "too many transactions" 64 $?
+$ofxkit serve --user alice --password-stdin < /dev/null > /dev/null 2>&1; check "no password given" 64 $?
+
 echo "$((checks - failures)) passed, $failures failed"
 [ "$failures" -eq 0 ]

@@ -3,6 +3,7 @@
 // statement requests the way `ofxkit respond` does.
 #include <signal.h>
 
+#include <atomic>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
@@ -25,10 +26,11 @@ const char kServeHelp[] =
     "per request on standard error, and ends after --max-requests, --max-seconds, or\n"
     "on SIGINT/SIGTERM.\n";
 
-loopback::Server* g_server = nullptr;
+// Read by the signal handler: an atomic pointer is lock-free, hence safe there.
+std::atomic<loopback::Server*> g_server{nullptr};
 
 extern "C" void OnSignal(int) {
-  if (g_server) g_server->RequestStop();
+  if (loopback::Server* server = g_server.load()) server->RequestStop();
 }
 
 loopback::HttpResponse TextResponse(int status, const char* text) {
@@ -45,11 +47,17 @@ loopback::HttpResponse Answer(const loopback::HttpRequest& rq, const RespondOpti
     rs.extraHeaders.emplace_back("Allow", "POST");
     return rs;
   }
-  OEBuffer body(0, 1u << 12);
-  body.WriteLarge(rq.body.data(), static_cast<uint32_t>(rq.body.size()));
+  // The whole body in one allocation; more than a buffer can hold is refused
+  // rather than parsed cut short.
+  OEBuffer body;
+  const uint32_t size = static_cast<uint32_t>(rq.body.size());
+  if (rq.body.size() >= OEBuffer::kMaxBufferSize || body.AllocateTo(size + 1) != OEBUF_OK ||
+      body.WriteLarge(rq.body.data(), size) != OEBUF_OK)
+    return TextResponse(413, "the request file is too large\n");
   ParsedFile parsed;
   std::string error;
   int rc = ParseOFXBuffer(body, "request", parsed, &error);
+  body.ClearBuffer('\0');  // the copy holds the user's password
   if (rc == kBadInput || rc == kParseFailed || parsed.isResponse)
     return TextResponse(400, "not an OFX request file\n");
   loopback::HttpResponse rs;
@@ -58,6 +66,20 @@ loopback::HttpResponse Answer(const loopback::HttpRequest& rq, const RespondOpti
     return TextResponse(500, "the response could not be written\n");
   rs.body.assign(out.GetBufferPtr() ? out.GetBufferPtr() : "", out.GetBufferSize());
   return rs;
+}
+
+// What the request log shows of a method or target: printable ASCII only, at
+// most 200 characters, and no query string, which may carry credentials.
+std::string Loggable(const std::string& text) {
+  std::string out;
+  for (char c : text) {
+    if (c == '?' || out.size() >= 200) {
+      out += c == '?' ? "?..." : "...";
+      break;
+    }
+    out += (c > ' ' && c < 127) ? c : '.';
+  }
+  return out;
 }
 
 bool WriteText(const std::string& path, const std::string& text, std::string* error) {
@@ -69,7 +91,7 @@ bool WriteText(const std::string& path, const std::string& text, std::string* er
 // Writes the URL under a temporary name, then renames it, so that a script
 // waiting for the file never reads half of it.
 bool WriteReadyFile(const std::string& path, const std::string& url, std::string* error) {
-  std::string partial = path + ".partial";
+  std::string partial = path + ".tmp";
   if (!WriteText(partial, url + "\n", error)) return false;
   if (std::rename(partial.c_str(), path.c_str()) != 0) {
     *error = "cannot rename " + partial;
@@ -130,28 +152,32 @@ int CmdServe(int argc, char** argv) {
   }
   loopback::Server listener(server, [&options](const loopback::HttpRequest& rq) {
     loopback::HttpResponse rs = Answer(rq, options);
-    std::fprintf(stderr, "%s %s %d %zu bytes\n", rq.method.c_str(), rq.target.c_str(), rs.status, rs.body.size());
+    std::fprintf(stderr, "%s %s %d %zu bytes\n", Loggable(rq.method).c_str(), Loggable(rq.target).c_str(),
+                 rs.status, rs.body.size());
     return rs;
   });
   if (!listener.Listen(&error)) {
     std::fprintf(stderr, "ofxkit serve: %s\n", error.c_str());
     return kBadInput;
   }
-  const std::string url = listener.BaseURL() + "/";
-  std::printf("listening on %s\n", url.c_str());
-  std::fflush(stdout);
-  if (!readyFile.empty() && !WriteReadyFile(readyFile, url, &error)) {
-    std::fprintf(stderr, "ofxkit serve: %s\n", error.c_str());
-    return kBadInput;
-  }
-  g_server = &listener;
+  // Handlers first, so that a script which stops the server as soon as it is
+  // announced always gets a clean exit.
+  g_server.store(&listener);
   struct sigaction action {};
   action.sa_handler = OnSignal;
   sigemptyset(&action.sa_mask);
   sigaction(SIGINT, &action, nullptr);
   sigaction(SIGTERM, &action, nullptr);
-  listener.Run();
-  g_server = nullptr;
+  const std::string url = listener.BaseURL() + "/";
+  std::printf("listening on %s\n", url.c_str());
+  std::fflush(stdout);
+  bool ready = readyFile.empty() || WriteReadyFile(readyFile, url, &error);
+  if (ready) listener.Run();
+  g_server.store(nullptr);
+  if (!ready) {
+    std::fprintf(stderr, "ofxkit serve: %s\n", error.c_str());
+    return kBadInput;
+  }
   if (!readyFile.empty()) std::remove(readyFile.c_str());
   return kClean;
 }
