@@ -53,6 +53,17 @@ void HeadersOf(const OEDataObj* obj, std::vector<Element>& out) {
       out.push_back({static_cast<OETagID>(h), value->c_str()});
 }
 
+// The children to show: the object's own, and a securities-list response
+// set's list, which stands beside its wrappers rather than among them.
+std::vector<const OEDataObj*> ChildrenOf(const OEDataObj* obj) {
+  std::vector<const OEDataObj*> out;
+  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
+    if (const OEDataObj* child = obj->GetChild(i)) out.push_back(child);
+  if (const auto* set = dynamic_cast<const OEMessageSetRs*>(obj))
+    if (set->GetSecList()) out.push_back(set->GetSecList());
+  return out;
+}
+
 const char* HeaderName(int32_t h) { return OEDataConversion::Text(static_cast<OEHeaderTag>(h)); }
 
 void DumpText(const OEDataObj* obj, int depth, FILE* out) {
@@ -64,9 +75,7 @@ void DumpText(const OEDataObj* obj, int depth, FILE* out) {
     std::fprintf(out, "%s  %s:%s\n", indent.c_str(), HeaderName(h.tag), h.value.c_str());
   for (const Element& e : ElementsOf(obj))
     std::fprintf(out, "%s  %s = %s\n", indent.c_str(), TagName(e.tag), e.value.c_str());
-  unsigned short n = obj->GetNumberOfChildren();
-  for (unsigned short i = 0; i < n; ++i)
-    if (const OEDataObj* child = obj->GetChild(i)) DumpText(child, depth + 1, out);
+  for (const OEDataObj* child : ChildrenOf(obj)) DumpText(child, depth + 1, out);
 }
 
 // Streams the tree as JSON, one object at a time, so a large statement does
@@ -94,11 +103,8 @@ void DumpJson(const OEDataObj* obj, FILE* out) {
     }
     std::fprintf(out, ",\"elements\":%s", els.dump(-1, ' ', false, nlohmann::ordered_json::error_handler_t::replace).c_str());
   }
-  unsigned short n = obj->GetNumberOfChildren();
   bool first = true;
-  for (unsigned short i = 0; i < n; ++i) {
-    const OEDataObj* child = obj->GetChild(i);
-    if (!child) continue;
+  for (const OEDataObj* child : ChildrenOf(obj)) {
     std::fprintf(out, first ? ",\"children\":[" : ",");
     first = false;
     DumpJson(child, out);

@@ -82,7 +82,7 @@ struct OEPlainStore {
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
               &OEWrapperListPut<ThisClass, Type, &ThisClass::m_##Name>,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, nullptr},
 
 // ALSOLIST: a further tag for the LIST field Name declared before.
 #define OE_DECLARE_ALSOLIST(Name, TAG, Type)
@@ -92,7 +92,7 @@ struct OEPlainStore {
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                  \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, nullptr},
 
 // ---------------------------------------------------------------------------
 
