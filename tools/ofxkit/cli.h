@@ -62,10 +62,19 @@ bool PromptPassword(const char* prompt, OEUserPassword& out);
 // What a statement request names.
 struct StatementRequestOptions {
   std::string org, fid, user, account, bankId, type, start, end, appId, appVersion;
+  // Brokerage statements: the broker, what to include besides transactions,
+  // and the securities to ask a security list for (comma-separated).
+  std::string brokerId, securities;
+  bool positions = false, openOrders = false, balance = false;
 };
 // Writes a sign-on + statement request file into out; false (with a message
 // on standard error) when an option is not valid.
 bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserPassword& password, OEBuffer& out);
+// Adds the brokerage statement request (and the security-list request) that
+// options name; false after a message when an option is not valid.
+bool AppendInvestmentRequest(const StatementRequestOptions& options, OERequest& request);
+// Writes a request file strictly into out; false after a message.
+bool WriteRequest(const OEFileRq& file, OEBuffer& out);
 
 // How a request is answered.
 struct RespondOptions {
@@ -84,10 +93,20 @@ bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options
 // With a user named, reads the password (from the terminal without echo, or
 // a line of standard input); false after a message when none is given.
 bool AskPassword(const char* command, RespondOptions& options);
+// Answers an investment statement or securities-list request set into out
+// (with the security list); false for a set of another type.
+bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, OEResponse& out);
 // Answers request and writes the response file into out; the build status.
 OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out);
 
+// A CSV field: quoted when it holds a comma, quote or line break.
+std::string Csv(const char* text);
+// Prints the transactions of the investment statements under root as CSV
+// (after a blank line when `separate`); false when there are none.
+bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool separate);
+
 int CmdDump(int argc, char** argv);
+int CmdPositions(int argc, char** argv);
 int CmdStatement(int argc, char** argv);
 int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);

@@ -12,8 +12,9 @@ namespace {
 const char kRespondHelp[] =
     "usage: ofxkit respond [--transactions N] [--user USER --password-stdin] REQUEST [-o FILE]\n"
     "Reads an OFX request file and writes the response a bank would send: a sign-on\n"
-    "response and, for each bank or card statement request, a statement with N\n"
-    "generated transactions (default 25) between the requested dates. With --user\n"
+    "response and, for each bank, card or investment statement request, a statement\n"
+    "with N generated transactions (default 25) between the requested dates; an\n"
+    "investment statement comes with the security list it refers to. With --user\n"
     "(and the password on standard input) the credentials are checked: a mismatch is\n"
     "answered with sign-on status 15500 and no statement.\n";
 
@@ -126,6 +127,7 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         out->AppendMessageSet(rsSet);
         continue;
       }
+      if (signedOn && AnswerInvestmentSet(*set, options.transactions, *out)) continue;
       bool card = set->GetType() == OE_TAG_CREDITCARDMSGSRQV1;
       if (!signedOn || (set->GetType() != OE_TAG_BANKMSGSRQV1 && !card)) continue;
       OEMessageSetRs* rsSet = new OEMessageSetRs();

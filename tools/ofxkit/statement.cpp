@@ -5,14 +5,6 @@
 #include "cli.h"
 
 namespace cli {
-namespace {
-
-const char kStatementHelp[] =
-    "usage: ofxkit statement [--account] FILE\n"
-    "Prints the transactions of every bank and credit-card statement of an OFX\n"
-    "response file as CSV: date,amount,type,fitid,name,memo,checknum\n"
-    "(dates as YYYY-MM-DD; with --account, a first column names the account).\n"
-    "Exit status as for 'ofxkit dump'.\n";
 
 // A CSV field: quoted when it holds a comma, quote or line break.
 std::string Csv(const char* text) {
@@ -22,6 +14,20 @@ std::string Csv(const char* text) {
   for (char c : s) q += c == '"' ? std::string("\"\"") : std::string(1, c);
   return q + "\"";
 }
+
+namespace {
+
+const char kStatementHelp[] =
+    "usage: ofxkit statement [--account] FILE\n"
+    "Prints the transactions of every bank and credit-card statement of an OFX\n"
+    "response file as CSV: date,amount,type,fitid,name,memo,checknum\n"
+    "(dates as YYYY-MM-DD; with --account, a first column names the account).\n"
+    "Investment statements follow (after a blank line when both are present),\n"
+    "one row per transaction of every kind in trade-date order:\n"
+    "date,kind,security,name,units,unitprice,commission,total,subacctsec,\n"
+    "subacctfund,subacctfrom,subacctto,fitid,memo (security is the ticker when\n"
+    "the file's security list names one, else the security id).\n"
+    "Exit status as for 'ofxkit dump'.\n";
 
 std::string IsoDate(const OEBankStatementTx& tx) {
   if (!tx.ValidateTag(OE_TAG_DTPOSTED)) return "";
@@ -82,7 +88,7 @@ int CmdStatement(int argc, char** argv) {
                  static_cast<int>(parsed.status));
   std::vector<const OEGenericStatementRs*> statements;
   CollectStatements(parsed.file.get(), statements);
-  std::printf("%sdate,amount,type,fitid,name,memo,checknum\n", withAccount ? "account," : "");
+  if (!statements.empty()) std::printf("%sdate,amount,type,fitid,name,memo,checknum\n", withAccount ? "account," : "");
   for (const OEGenericStatementRs* rs : statements) {
     const OEBankTransactionList* list = rs->GetBankTransactionList();
     if (!list) continue;
@@ -96,7 +102,9 @@ int CmdStatement(int argc, char** argv) {
                   Csv(tx->GetMemo()).c_str(), Csv(tx->GetCheckNum()).c_str());
     }
   }
-  if (statements.empty()) std::fprintf(stderr, "ofxkit statement: no bank or card statement in %s\n", files[0].c_str());
+  bool investments = PrintInvestmentTransactions(parsed.file.get(), withAccount, !statements.empty());
+  if (statements.empty() && !investments)
+    std::fprintf(stderr, "ofxkit statement: no bank, card or investment statement in %s\n", files[0].c_str());
   return rc;
 }
 
