@@ -13,13 +13,14 @@ OE_DEFINE_AGGREGATE(OEInvOOList, OEAggregate, OE_INVOOLIST_FIELDS, INVOOLIST,
 
 namespace {
 // The INVTRAN of a transaction kind: its own, or the one inside its INVBUY
-// or INVSELL.
-OEInvTran* InnerInvTran(const OEDataObj* kind) {
-  for (unsigned short i = 0, n = kind->GetNumberOfChildren(); i < n; ++i) {
-    OEDataObj* child = kind->GetChild(i);
+// or INVSELL. Found through the kind's description, without a cast per child.
+OEInvTran* InnerInvTran(const OEAggregate* kind) {
+  for (const OEFieldDesc* d : kind->GetInfo().children) {
+    if (d->kind != OE_FIELD_CHILD) continue;
+    OEDataObj* child = d->get(kind, 0);
     if (!child) continue;
-    if (auto* tran = dynamic_cast<OEInvTran*>(child)) return tran;
-    if (child->GetType() == OE_TAG_INVBUY || child->GetType() == OE_TAG_INVSELL) return InnerInvTran(child);
+    if (d->tag == OE_TAG_INVTRAN) return static_cast<OEInvTran*>(child);
+    if (d->tag == OE_TAG_INVBUY || d->tag == OE_TAG_INVSELL) return InnerInvTran(static_cast<OEAggregate*>(child));
   }
   return nullptr;
 }
@@ -35,7 +36,8 @@ unsigned short OEInvTranList::FillGenericInvTranList(std::vector<OEInvTran*>& ar
     OETagID tag = d->tag;
     if (tag == OE_TAG_JRNLFUND || tag == OE_TAG_JRNLSEC) continue;
     for (unsigned short k = 0, n = d->count(this); k < n; ++k) {
-      OEDataObj* kind = d->get(this, k);
+      // Every element of a kind's array is an aggregate of that kind's class.
+      auto* kind = static_cast<OEAggregate*>(d->get(this, k));
       if (!kind) continue;
       if (tag != OE_TAG_INVBANKTRAN) {
         if (OEInvTran* tran = InnerInvTran(kind)) array.push_back(tran);
