@@ -35,6 +35,10 @@
 #include "ofxkit/messages/mail/OEEMailProfile.h"
 #include "ofxkit/messages/profile/OEMessageSetCore.h"
 #include "ofxkit/messages/profile/OEMessageSetVersion.h"
+#include "ofxkit/messages/profile/OEProfile.h"
+#include "ofxkit/messages/signup/OESignUp.h"
+#include "ofxkit/messages/billpay/OEBillPayMessageSet.h"
+#include "ofxkit/messages/xfer/OEXferMessageSets.h"
 #include "ofxkit/messages/xfer/OEXferProfile.h"
 
 #include "ofxkit/parse/OEParseLogger.h"

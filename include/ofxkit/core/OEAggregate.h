@@ -27,6 +27,8 @@
 //   CHILD  an owned child aggregate; Get<Name>() and Set<Name>(Type*).
 //   ALSO   a further tag for the CHILD field <Name> declared before (an account
 //          that stands as "BANKACCTFROM" or "CCACCTFROM"); declares nothing.
+//   ALSOLIST  a further tag for the LIST field <Name> declared before: one
+//          list of children of several kinds, kept in read order.
 //   LIST   owned repeated children; GetNum<Name>(), Get<Name>(i),
 //          Set<Name>(i, Type*), Append<Name>(Type*), Clear<Name>().
 //   VALUES a repeated element of a VALUE type or an OEString type;
@@ -180,7 +182,11 @@ struct OEChildCreator;
     static cls* Make(OEDataObjFactory* f, OETagID) { return f->creator(); }                \
   };
 #define OE_CREATOR_PLAIN(creator, type)
+// A family base made by the tag it stands under specialises OEChildCreator
+// itself (see OEAccount.h, OEMessageSetVersion.h).
+#define OE_CREATOR_FAMILY(creator, type)
 #include "ofxkit/core/OEFactoryCreators.def"
+#undef OE_CREATOR_FAMILY
 #undef OE_CREATOR_PLAIN
 #undef OE_CREATOR
 
@@ -588,6 +594,9 @@ struct OEValuesOps {
  protected:                                                                                       \
   OEDynamicArrayTyped<Type> m_##Name;
 
+// ALSOLIST: a further tag for the LIST field Name declared before.
+#define OE_DECLARE_ALSOLIST(Name, TAG, Type)
+
 #define OE_DECLARE_VALUES(Name, TAG, Type)                                                        \
  public:                                                                                          \
   unsigned short GetNum##Name() const { return m_##Name.Entries(); }                              \
@@ -650,6 +659,13 @@ struct OEValuesOps {
 #define OE_DESC_ALSO(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, true)
 #define OE_DESC_LIST(Name, TAG, Type)                                                                    \
   OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, false, nullptr, nullptr, nullptr, nullptr,                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
+#define OE_DESC_ALSOLIST(Name, TAG, Type)                                                                \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, true, nullptr, nullptr, nullptr, nullptr,                    \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
