@@ -42,6 +42,8 @@ struct ParsedFile {
   bool isResponse = false;
   OEParseStatus status = OE_PARSE_OK;
   OEDataObj* objectWithError = nullptr;
+  // What the text holds that the tree does not (read once more after the parse).
+  ofxkit::AuditReport audit;
 };
 
 // Reads a whole file; false with a message when it cannot.
@@ -53,6 +55,15 @@ int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error
 // The same for a file already in memory; name is used in messages.
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error);
 int ExitForStatus(OEParseStatus status);
+// Prints one line per loss the audit found ("ofxkit COMMAND: 3 of 6 STMTTRN in
+// the file were not read: ...") on standard error and answers the exit status:
+// rc, but never kClean when something of the file was not read.
+int ReportLosses(const char* command, const ParsedFile& parsed, int rc);
+// A text field of CSV output: quoted when it holds a comma, quote or line
+// break. Unless raw, a text that a spreadsheet would run as a formula (one
+// that begins with '=', '+', '-', '@', a tab or a carriage return) is
+// prefixed with a single quote. Amounts and dates are not passed through here.
+std::string CsvText(const char* text, bool raw);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard

@@ -8,20 +8,13 @@ namespace cli {
 namespace {
 
 const char kStatementHelp[] =
-    "usage: ofxkit statement [--account] FILE\n"
+    "usage: ofxkit statement [--account] [--raw] FILE\n"
     "Prints the transactions of every bank and credit-card statement of an OFX\n"
     "response file as CSV: date,amount,type,fitid,name,memo,checknum\n"
     "(dates as YYYY-MM-DD; with --account, a first column names the account).\n"
+    "Text that a spreadsheet would run as a formula (beginning with = + - @, a tab\n"
+    "or a carriage return) is prefixed with ' unless --raw is given; amounts never are.\n"
     "Exit status as for 'ofxkit dump'.\n";
-
-// A CSV field: quoted when it holds a comma, quote or line break.
-std::string Csv(const char* text) {
-  std::string s(text ? text : "");
-  if (s.find_first_of(",\"\r\n") == std::string::npos) return s;
-  std::string q = "\"";
-  for (char c : s) q += c == '"' ? std::string("\"\"") : std::string(1, c);
-  return q + "\"";
-}
 
 std::string IsoDate(const OEBankStatementTx& tx) {
   if (!tx.ValidateTag(OE_TAG_DTPOSTED)) return "";
@@ -64,6 +57,7 @@ int CmdStatement(int argc, char** argv) {
     return kClean;
   }
   bool withAccount = args.Flag("account");
+  bool raw = args.Flag("raw");
   std::string error;
   std::vector<std::string> files = args.Positional(&error);
   if (!error.empty() || files.size() != 1) {
@@ -86,18 +80,19 @@ int CmdStatement(int argc, char** argv) {
   for (const OEGenericStatementRs* rs : statements) {
     const OEBankTransactionList* list = rs->GetBankTransactionList();
     if (!list) continue;
-    std::string account = withAccount ? Csv(AccountName(*rs).c_str()) + "," : "";
+    std::string account = withAccount ? CsvText(AccountName(*rs).c_str(), raw) + "," : "";
     for (unsigned short i = 0; i < list->GetNumStatementTx(); ++i) {
       const OEBankStatementTx* tx = list->GetStatementTx(i);
       if (!tx) continue;
       const char* type = tx->ValidateTag(OE_TAG_TRNTYPE) ? OEDataConversion::Text(tx->GetTxType()) : "";
       std::printf("%s%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), IsoDate(*tx).c_str(), Amount(*tx).c_str(),
-                  Csv(type).c_str(), Csv(tx->GetFITId()).c_str(), Csv(tx->GetName()).c_str(),
-                  Csv(tx->GetMemo()).c_str(), Csv(tx->GetCheckNum()).c_str());
+                  CsvText(type, raw).c_str(), CsvText(tx->GetFITId(), raw).c_str(),
+                  CsvText(tx->GetName(), raw).c_str(), CsvText(tx->GetMemo(), raw).c_str(),
+                  CsvText(tx->GetCheckNum(), raw).c_str());
     }
   }
   if (statements.empty()) std::fprintf(stderr, "ofxkit statement: no bank or card statement in %s\n", files[0].c_str());
-  return rc;
+  return ReportLosses("statement", parsed, rc);
 }
 
 }  // namespace cli
