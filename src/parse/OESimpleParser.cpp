@@ -1,5 +1,6 @@
 #include "ofxkit/parse/OESimpleParser.h"
 
+#include <cstdio>
 #include <cstring>
 #include <new>
 
@@ -60,13 +61,24 @@ OEParseStatus OESimpleParser::ReadHeaders(OEParseEngine& engine, OEDataObj* root
   OEString name;
   // First block: MIME or HTTP-style lines (with their names), then the OFX
   // header lines. A text that starts with the OFX headers reads them here.
-  while (engine.GetHeader(tag, value, &name)) {
-    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, &name);
-    if (status != OE_PARSE_OK) return status;
-  }
-  while (engine.GetHeader(tag, value, nullptr)) {
-    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, nullptr);
-    if (status != OE_PARSE_OK) return status;
+  // Real header blocks hold a few dozen lines; past kMaxHeaderLines the lines
+  // are still read (so the body is found where it starts) but not kept.
+  uint32_t lines = 0;
+  for (int block = 0; block < 2; ++block) {
+    OEString* names = block == 0 ? &name : nullptr;
+    while (engine.GetHeader(tag, value, names)) {
+      if (++lines > kMaxHeaderLines) {
+        if (lines == kMaxHeaderLines + 1) {
+          char text[64];
+          snprintf(text, sizeof text, "more than %u header lines: the rest were not read",
+                   static_cast<unsigned>(kMaxHeaderLines));
+          LogRecord(OEPW_BADFORMAT, OEString(text), names ? name.c_str() : "", OE_TAG_NONE);
+        }
+        continue;
+      }
+      OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, names);
+      if (status != OE_PARSE_OK) return status;
+    }
   }
   OETagID type = root->GetType();
   if (type == OE_TAG_OFXFILERS || type == OE_TAG_OFXFILERQ) {

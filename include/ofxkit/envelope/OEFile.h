@@ -16,6 +16,9 @@
 // written by OEBuilder::Build.
 #pragma once
 
+#include <string>
+#include <unordered_map>
+
 #include <type_traits>
 
 #include "ofxkit/core/OEDataObj.h"
@@ -181,6 +184,10 @@ class OEFile : public OEDataObj, public OEHeaderValidation {
   OEDynamicArraySubfile m_subfiles;
   // Values of OFXHEADER..NEWFILEUID; an empty string means not given.
   OEString m_headers[kLastHeader - kFirstHeader + 1];
+  // MIME header positions by upper-cased name, so that a long header block
+  // is read in linear time; the first m_mimeIndexed headers are in it.
+  mutable std::unordered_map<std::string, unsigned short> m_mimeIndex;
+  mutable unsigned short m_mimeIndexed = 0;
 };
 
 // A file with an OFX header block: writes it with defaults for the headers

@@ -17,6 +17,9 @@ class OEHeaderValidation {
 
 class OESimpleParser : public OEParser {
  public:
+  // Header lines kept from one file; the rest are read past with a warning.
+  static constexpr uint32_t kMaxHeaderLines = 1000;
+
   OESimpleParser();
 
   // Parses buffer into root. Answers 0 for a clean parse, 7 when the text was
