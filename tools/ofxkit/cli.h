@@ -78,6 +78,10 @@ struct StatementRequestOptions {
 // on standard error) when an option is not valid.
 bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserPassword& password, OEBuffer& out);
 
+// Transactions generated for one request file at most (the most that fits in
+// one response buffer), so also the largest --transactions.
+constexpr unsigned kMaxTransactionsPerFile = 25000;
+
 // How a request is answered.
 struct RespondOptions {
   unsigned transactions = 25;
