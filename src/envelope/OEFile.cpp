@@ -359,7 +359,11 @@ OEBuildStatus OEFileOFX::BuildHeaders(OEBuilder* builder) const {
   return builder->AddBlankLine();
 }
 
-unsigned short OEFileOFX::ValidateHeaders() const {
+unsigned short OEFileOFX::ValidateHeaders() const { return CheckHeaders(false); }
+
+unsigned short OEFileOFX::ValidateHeadersTolerantly() const { return CheckHeaders(true); }
+
+unsigned short OEFileOFX::CheckHeaders(bool tolerant) const {
   unsigned short result = 1;
   OEDataObj* self = const_cast<OEFileOFX*>(this);
   for (int t = OE_HEADER_OFXHEADER; t <= OE_HEADER_NEWFILEUID; ++t) {
@@ -372,7 +376,9 @@ unsigned short OEFileOFX::ValidateHeaders() const {
     }
     if (rule.check == kUnchecked || Accepted(rule, *value)) continue;
     OELogWarning(OEPW_BADFORMAT, *value, OEString(OEDataConversion::Text(tag)), GetType(), self);
-    if (rule.check == kFatal) result = 0;
+    const bool tolerated = tolerant && tag == OE_HEADER_ENCODING &&
+                           (value->strcmpi("UTF-8") || value->strcmpi("UTF8") || value->strcmpi("UNICODE"));
+    if (rule.check == kFatal && !tolerated) result = 0;
   }
   return result;
 }

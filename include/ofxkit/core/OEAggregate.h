@@ -279,13 +279,13 @@ class OEAggregate : public OEDataObj {
   void LogFieldFault(OEParseWarning warning, OETagID tag, const OEString& text);
   // Clears a presence bit without the warning ClearTag gives for unknown tags.
   void ClearTagQuietly(OETagID tag);
+  // The field that takes the tag in this class, or null.
+  const OEFieldDesc* FieldAt(OETagID tag) const;
 
  protected:
   // Deletes the children held by the fields this class declares itself.
   void DestroyOwnFields(const OEAggregateInfo& info);
 
- private:
-  const OEFieldDesc* FieldAt(OETagID tag) const;
 };
 
 // ---------------------------------------------------------------------------

@@ -206,6 +206,11 @@ class OEFileOFX : public OEFile {
   // Logs every missing or unexpected header; 0 only for an unknown DATA,
   // ENCODING or COMPRESSION value.
   unsigned short ValidateHeaders() const override;
+  // Also accepts "ENCODING:UTF-8" and "ENCODING:UNICODE" (with the warning a
+  // wrong value gets), which real servers send.
+  unsigned short ValidateHeadersTolerantly() const override;
+ private:
+  unsigned short CheckHeaders(bool tolerant) const;
 };
 
 // What request and response files share: one Item per OFX aggregate of the
