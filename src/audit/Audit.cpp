@@ -46,6 +46,18 @@ bool SameName(const char* a, const char* b, size_t n) {
   return true;
 }
 
+std::string TagText(OETagID id) {
+  OETagDictionary* dictionary = OETagDictionary::TheOETagDictionary();
+  const char* name = dictionary && id ? dictionary->GetTagString(id) : nullptr;
+  return name ? name : "?";
+}
+
+std::string Ordinal(uint32_t n) {
+  const uint32_t mod100 = n % 100, mod10 = n % 10;
+  const char* suffix = (mod100 >= 11 && mod100 <= 13) ? "th" : mod10 == 1 ? "st" : mod10 == 2 ? "nd" : mod10 == 3 ? "rd" : "th";
+  return std::to_string(n) + suffix;
+}
+
 // The engine's item reader, without the tag lookups of a parse (which log).
 class ItemReader : public OEParseEngine {
  public:
@@ -79,6 +91,7 @@ class Auditor {
   struct Group {  // findings of one kind, tag and parent, gathered
     AuditKind kind;
     OETagID tag, parent;
+    std::string name;  // of an unknown tag, as first written
     uint32_t count;
     int32_t position, until;
   };
@@ -89,7 +102,8 @@ class Auditor {
   void EndTag(const OEParseEngine::OETagItemInfo& item);
   void CheckTag(const OEParseEngine::OETagItemInfo& item, OETagID id);
   void CheckCData(const OEParseEngine::OETagItemInfo& item);
-  void Note(AuditKind kind, OETagID tag, OETagID parent, int32_t position, int32_t until);
+  void Note(AuditKind kind, OETagID tag, OETagID parent, int32_t position, int32_t until,
+            const OEParseEngine::OETagItemInfo* item = nullptr);
   OETagID Lookup(const char* name, unsigned short length) const;
   uint32_t& Slot(std::vector<uint32_t>& counts, OETagID id) {
     if (id >= counts.size()) counts.resize(id + 1u, 0);
@@ -149,14 +163,22 @@ void Auditor::WalkTree() {
   }
 }
 
-void Auditor::Note(AuditKind kind, OETagID tag, OETagID parent, int32_t position, int32_t until) {
+void Auditor::Note(AuditKind kind, OETagID tag, OETagID parent, int32_t position, int32_t until,
+                   const OEParseEngine::OETagItemInfo* item) {
   for (Group& g : m_groups) {
     if (g.kind == kind && g.tag == tag && g.parent == parent) {
       ++g.count;
       return;
     }
   }
-  m_groups.push_back({kind, tag, parent, 1, position, until});
+  std::string name;
+  if (item && tag == OE_TAG_NONE) {
+    constexpr unsigned short kShown = 40;
+    name.assign(m_data + item->start, std::min(item->length, kShown));
+    for (char& c : name)
+      if (static_cast<unsigned char>(c) < ' ' || static_cast<unsigned char>(c) >= 0x7F) c = '?';
+  }
+  m_groups.push_back({kind, tag, parent, std::move(name), 1, position, until});
 }
 
 // A tag whose text, between its name and the '>' that closes it, holds a '<'
@@ -167,7 +189,7 @@ void Auditor::CheckTag(const OEParseEngine::OETagItemInfo& item, OETagID id) {
   for (int32_t i = from; i < to; ++i) {
     const char c = m_data[i];
     if (c == '<' || c == '\n' || c == '\r') {
-      Note(AuditKind::kBrokenTag, id, OE_TAG_NONE, item.start, item.end);
+      Note(AuditKind::kBrokenTag, id, OE_TAG_NONE, item.start, item.end, &item);
       return;
     }
   }
@@ -306,6 +328,7 @@ AuditReport Auditor::Run() {
       f.kind = g.kind;
       f.tag = g.tag;
       f.parent = g.parent;
+      f.name = g.tag ? TagText(g.tag) : g.name;
       f.occurrences = g.count;
       f.position = g.position;
       f.until = g.until;
@@ -315,8 +338,11 @@ AuditReport Auditor::Run() {
       const uint32_t text = CountOf(m_inText, id), tree = CountOf(m_inTree, id);
       if (text == tree) continue;
       AuditFinding f;
-      f.kind = text > tree ? (id == OE_TAG_OFX ? AuditKind::kOFXAfterEnd : AuditKind::kMissing) : AuditKind::kSurplus;
+      f.kind = text <= tree                      ? AuditKind::kSurplus
+               : (id == OE_TAG_OFX && tree > 0) ? AuditKind::kOFXAfterEnd
+                                                : AuditKind::kMissing;
       f.tag = id;
+      f.name = TagText(id);
       f.inText = text;
       f.inTree = tree;
       if (text > tree && id < m_firstUnread.size()) f.position = m_firstUnread[id];
@@ -330,18 +356,6 @@ AuditReport Auditor::Run() {
     m_report.complete = false;
   }
   return std::move(m_report);
-}
-
-std::string TagText(OETagID id) {
-  OETagDictionary* dictionary = OETagDictionary::TheOETagDictionary();
-  const char* name = dictionary && id ? dictionary->GetTagString(id) : nullptr;
-  return name ? name : "?";
-}
-
-std::string Ordinal(uint32_t n) {
-  const uint32_t mod100 = n % 100, mod10 = n % 10;
-  const char* suffix = (mod100 >= 11 && mod100 <= 13) ? "th" : mod10 == 1 ? "st" : mod10 == 2 ? "nd" : mod10 == 3 ? "rd" : "th";
-  return std::to_string(n) + suffix;
 }
 
 }  // namespace
@@ -371,7 +385,6 @@ bool AuditReport::HasLoss() const {
 }
 
 std::string AuditFinding::Describe() const {
-  const std::string name = TagText(tag);
   const std::string at = position >= 0 ? " at byte " + std::to_string(position) : std::string();
   const std::string times = occurrences > 1 ? " (" + std::to_string(occurrences) + " places, the first" + at + ")" : at;
   switch (kind) {

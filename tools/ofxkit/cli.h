@@ -38,6 +38,9 @@ class Args {
 
 // A parsed OFX file: a request or a response file, whichever it is.
 struct ParsedFile {
+  // Set before the parse: the library's recovery rules only, without the
+  // tolerant reading (OE_READ_TOLERANT) that the tool uses by default.
+  bool strict = false;
   std::unique_ptr<OEFileOFX> file;
   bool isResponse = false;
   OEParseStatus status = OE_PARSE_OK;
@@ -108,5 +111,6 @@ int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
 int CmdExchange(int argc, char** argv);
 int CmdServe(int argc, char** argv);
+int CmdCheck(int argc, char** argv);
 
 }  // namespace cli

@@ -160,6 +160,7 @@ int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed
   else
     parsed.file.reset(new OEFileRq());
   OESimpleParser parser;
+  parser.SetReadingOptions(parsed.strict ? OE_READ_STRICT : OE_READ_TOLERANT);
   parsed.status = parser.Parse(&buffer, parsed.file.get(), 0);
   parsed.objectWithError = parser.GetObjectWithError();
   parsed.audit = ofxkit::AuditParse(buffer, *parsed.file);

@@ -9,10 +9,13 @@ namespace cli {
 namespace {
 
 const char kDumpHelp[] =
-    "usage: ofxkit dump [--json] FILE\n"
+    "usage: ofxkit dump [--json] [--strict] FILE\n"
     "Parses an OFX request or response file and prints its object tree, then the\n"
     "warnings of the parse (code, tag, value, position). Passwords are never shown.\n"
     "  --json   print the same as one JSON document\n"
+    "  --strict read by the OFX 1.x rules only (by default, blank lines before the\n"
+    "           headers, ENCODING:UTF-8 and empty elements are read, with warnings)\n"
+    "Data of the file that could not be read is reported on standard error.\n"
     "Exit status: 0 clean parse, 1 parsed with warnings, 2 parse failed, 3 unreadable\n"
     "or not OFX, 64 bad command line.\n";
 
@@ -160,6 +163,7 @@ int CmdDump(int argc, char** argv) {
     return kClean;
   }
   bool json = args.Flag("json");
+  bool strict = args.Flag("strict");
   std::string error;
   std::vector<std::string> files = args.Positional(&error);
   if (!error.empty() || files.size() != 1) {
@@ -167,6 +171,7 @@ int CmdDump(int argc, char** argv) {
     return kUsage;
   }
   ParsedFile parsed;
+  parsed.strict = strict;
   int rc = ParseOFXFile(files[0], parsed, &error);
   if (rc == kBadInput) {
     std::fprintf(stderr, "ofxkit dump: %s\n", error.c_str());

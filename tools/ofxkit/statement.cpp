@@ -8,13 +8,15 @@ namespace cli {
 namespace {
 
 const char kStatementHelp[] =
-    "usage: ofxkit statement [--account] [--raw] FILE\n"
+    "usage: ofxkit statement [--account] [--raw] [--strict] FILE\n"
     "Prints the transactions of every bank and credit-card statement of an OFX\n"
     "response file as CSV: date,amount,type,fitid,name,memo,checknum\n"
     "(dates as YYYY-MM-DD; with --account, a first column names the account).\n"
     "Text that a spreadsheet would run as a formula (beginning with = + - @, a tab\n"
     "or a carriage return) is prefixed with ' unless --raw is given; amounts never are.\n"
-    "Exit status as for 'ofxkit dump'.\n";
+    "--strict reads by the OFX 1.x rules only, as 'ofxkit dump --strict' does.\n"
+    "Transactions of the file that could not be read are reported on standard\n"
+    "error, and the exit status is then never 0. Exit status as for 'ofxkit dump'.\n";
 
 std::string IsoDate(const OEBankStatementTx& tx) {
   if (!tx.ValidateTag(OE_TAG_DTPOSTED)) return "";
@@ -58,6 +60,7 @@ int CmdStatement(int argc, char** argv) {
   }
   bool withAccount = args.Flag("account");
   bool raw = args.Flag("raw");
+  bool strict = args.Flag("strict");
   std::string error;
   std::vector<std::string> files = args.Positional(&error);
   if (!error.empty() || files.size() != 1) {
@@ -66,6 +69,7 @@ int CmdStatement(int argc, char** argv) {
     return kUsage;
   }
   ParsedFile parsed;
+  parsed.strict = strict;
   int rc = ParseOFXFile(files[0], parsed, &error);
   if (rc == kBadInput) {
     std::fprintf(stderr, "ofxkit statement: %s\n", error.c_str());

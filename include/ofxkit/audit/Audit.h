@@ -43,6 +43,8 @@ struct AuditFinding {
   // The aggregate counted (kMissing, kSurplus, kOFXAfterEnd), the tag that is
   // broken (kBrokenTag) or the element or child given again (kReplaced).
   OETagID tag = OE_TAG_NONE;
+  // The tag's name: the dictionary's, or for an unknown tag as written.
+  std::string name;
   // kReplaced: the aggregate in which it was given again.
   OETagID parent = OE_TAG_NONE;
   // kMissing, kSurplus, kOFXAfterEnd: start tags in the text, objects in the tree.
