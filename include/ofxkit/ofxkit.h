@@ -50,6 +50,8 @@
 #include "ofxkit/envelope/OERequest.h"
 #include "ofxkit/envelope/OEFile.h"
 
+#include "ofxkit/audit/Audit.h"
+
 #include "ofxkit/net/OENet.h"
 #include "ofxkit/net/NCGateway.h"
 #include "ofxkit/net/GXNNet.h"

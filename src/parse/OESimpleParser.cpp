@@ -1,8 +1,10 @@
 #include "ofxkit/parse/OESimpleParser.h"
 
+#include <cstdio>
 #include <cstring>
 #include <new>
 
+#include "ofxkit/core/OEAggregate.h"
 #include "ofxkit/core/OEDataObj.h"
 #include "ofxkit/core/OEDataObjFactory.h"
 #include "ofxkit/core/OETagDictionary.h"
@@ -60,20 +62,47 @@ OEParseStatus OESimpleParser::ReadHeaders(OEParseEngine& engine, OEDataObj* root
   OEString name;
   // First block: MIME or HTTP-style lines (with their names), then the OFX
   // header lines. A text that starts with the OFX headers reads them here.
-  while (engine.GetHeader(tag, value, &name)) {
-    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, &name);
-    if (status != OE_PARSE_OK) return status;
-  }
-  while (engine.GetHeader(tag, value, nullptr)) {
-    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, nullptr);
-    if (status != OE_PARSE_OK) return status;
+  // Real header blocks hold a few dozen lines; past kMaxHeaderLines the lines
+  // are still read (so the body is found where it starts) but not kept.
+  uint32_t lines = 0;
+  if ((m_options & OE_READ_TOLERANT) && engine.SkipBlankLines())
+    LogRecord(OEPW_BADFORMAT, OEString("blank lines before the header block"), "", OE_TAG_NONE);
+  for (int block = 0; block < 2; ++block) {
+    OEString* names = block == 0 ? &name : nullptr;
+    while (engine.GetHeader(tag, value, names)) {
+      if (++lines > kMaxHeaderLines) {
+        if (lines == kMaxHeaderLines + 1) {
+          char text[64];
+          snprintf(text, sizeof text, "more than %u header lines: the rest were not read",
+                   static_cast<unsigned>(kMaxHeaderLines));
+          LogRecord(OEPW_BADFORMAT, OEString(text), names ? name.c_str() : "", OE_TAG_NONE);
+        }
+        continue;
+      }
+      OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, names);
+      if (status != OE_PARSE_OK) return status;
+    }
   }
   OETagID type = root->GetType();
   if (type == OE_TAG_OFXFILERS || type == OE_TAG_OFXFILERQ) {
     const OEHeaderValidation* file = dynamic_cast<const OEHeaderValidation*>(root);
-    if (file && !file->ValidateHeaders()) return OE_PARSE_NOT_HANDLED;
+    if (file && !((m_options & OE_READ_TOLERANT) ? file->ValidateHeadersTolerantly() : file->ValidateHeaders()))
+      return OE_PARSE_NOT_HANDLED;
   }
   return OE_PARSE_OK;
+}
+
+// A tolerant reading takes an element of the current aggregate that is
+// directly followed by another tag ("<MEMO><NAME>") as an empty element:
+// nothing is set, and a warning names it. False when the tag is no element
+// of the current object (it then goes to HandleTagStart as usual).
+bool OESimpleParser::ReadEmptyElement(const OETagDictionaryEntry& entry) {
+  if (!(m_options & OE_READ_TOLERANT)) return false;
+  const OEAggregate* aggregate = dynamic_cast<const OEAggregate*>(GetCurrentObj());
+  const OEFieldDesc* field = aggregate ? aggregate->FieldAt(entry.id) : nullptr;
+  if (!field || (field->kind != OE_FIELD_ELEMENT && field->kind != OE_FIELD_VALUES)) return false;
+  LogRecord(OEPW_BADFORMAT, OEString(), entry.name, entry.id);
+  return true;
 }
 
 OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) {
@@ -92,6 +121,11 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
     OEDataObj* current = GetCurrentObj();
     switch (kind) {
       case OE_TAG_START:
+        if (IsValidTag(entry.id) && ReadEmptyElement(entry)) {
+          previous = OE_TAG_ELEMENT;  // so that its end tag, when given, is passed over
+          previousElement = entry.id;
+          break;
+        }
         if (!IsValidTag(entry.id)) {
           LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
           engine.SkipCurrentTag();

@@ -38,10 +38,15 @@ class Args {
 
 // A parsed OFX file: a request or a response file, whichever it is.
 struct ParsedFile {
+  // Set before the parse: the library's recovery rules only, without the
+  // tolerant reading (OE_READ_TOLERANT) that the tool uses by default.
+  bool strict = false;
   std::unique_ptr<OEFileOFX> file;
   bool isResponse = false;
   OEParseStatus status = OE_PARSE_OK;
   OEDataObj* objectWithError = nullptr;
+  // What the text holds that the tree does not (read once more after the parse).
+  ofxkit::AuditReport audit;
 };
 
 // Reads a whole file; false with a message when it cannot.
@@ -53,6 +58,15 @@ int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error
 // The same for a file already in memory; name is used in messages.
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error);
 int ExitForStatus(OEParseStatus status);
+// Prints one line per loss the audit found ("ofxkit COMMAND: 3 of 6 STMTTRN in
+// the file were not read: ...") on standard error and answers the exit status:
+// rc, but never kClean when something of the file was not read.
+int ReportLosses(const char* command, const ParsedFile& parsed, int rc);
+// A text field of CSV output: quoted when it holds a comma, quote or line
+// break. Unless raw, a text that a spreadsheet would run as a formula (one
+// that begins with '=', '+', '-', '@', a tab or a carriage return) is
+// prefixed with a single quote. Amounts and dates are not passed through here.
+std::string CsvText(const char* text, bool raw);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard
@@ -75,6 +89,10 @@ bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserP
 bool AppendInvestmentRequest(const StatementRequestOptions& options, OERequest& request);
 // Writes a request file strictly into out; false after a message.
 bool WriteRequest(const OEFileRq& file, OEBuffer& out);
+
+// Transactions generated for one request file at most (the most that fits in
+// one response buffer), so also the largest --transactions.
+constexpr unsigned kMaxTransactionsPerFile = 25000;
 
 // How a request is answered.
 struct RespondOptions {
@@ -99,11 +117,10 @@ bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, OERes
 // Answers request and writes the response file into out; the build status.
 OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out);
 
-// A CSV field: quoted when it holds a comma, quote or line break.
-std::string Csv(const char* text);
 // Prints the transactions of the investment statements under root as CSV
-// (after a blank line when `separate`); false when there are none.
-bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool separate);
+// (after a blank line when `separate`; text fields as CsvText makes them);
+// false when there are none.
+bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bool separate);
 
 int CmdDump(int argc, char** argv);
 int CmdPositions(int argc, char** argv);
@@ -112,5 +129,6 @@ int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
 int CmdExchange(int argc, char** argv);
 int CmdServe(int argc, char** argv);
+int CmdCheck(int argc, char** argv);
 
 }  // namespace cli

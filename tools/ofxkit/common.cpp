@@ -2,6 +2,7 @@
 #include <termios.h>
 #include <unistd.h>
 
+#include <cctype>
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
@@ -113,14 +114,24 @@ bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* err
 }
 
 namespace {
-// Case-insensitive search for `needle` in the buffer.
-bool Contains(const OEBuffer& buffer, const char* needle) {
+inline bool TagSpace(char c) { return c == ' ' || c == '\n' || c == '\r' || c == '\t'; }
+
+// Whether the buffer holds a tag name ending in `name` (upper case), matched
+// ignoring case and followed by whitespace or '>', as the parser reads names.
+// With whole, the name must be the whole tag name: '<', blanks, then name.
+// NUL bytes do not stop the search, so that a file whose text the parser cuts
+// short is still recognised (and its loss reported).
+bool HasTagName(const OEBuffer& buffer, const char* name, bool whole) {
   const char* data = buffer.GetBufferPtr();
-  size_t size = buffer.GetBufferSize(), n = std::strlen(needle);
+  const size_t size = data ? buffer.GetBufferSize() : 0, n = std::strlen(name);
   for (size_t i = 0; i + n <= size; ++i) {
     size_t k = 0;
-    while (k < n && std::toupper(static_cast<unsigned char>(data[i + k])) == needle[k]) ++k;
-    if (k == n) return true;
+    while (k < n && std::toupper(static_cast<unsigned char>(data[i + k])) == name[k]) ++k;
+    if (k < n || (i + n < size && data[i + n] != '>' && !TagSpace(data[i + n]))) continue;
+    if (!whole) return true;
+    size_t j = i;
+    while (j > 0 && TagSpace(data[j - 1])) --j;
+    if (j > 0 && data[j - 1] == '<') return true;
   }
   return false;
 }
@@ -139,19 +150,38 @@ int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error
 }
 
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error) {
-  if (!Contains(buffer, "<OFX>")) {
+  if (!HasTagName(buffer, "OFX", true)) {
     *error = name + ": not an OFX file (no <OFX> aggregate)";
     return kBadInput;
   }
-  parsed.isResponse = Contains(buffer, "MSGSRSV1>") || !Contains(buffer, "MSGSRQV1>");
+  parsed.isResponse = HasTagName(buffer, "MSGSRSV1", false) || !HasTagName(buffer, "MSGSRQV1", false);
   if (parsed.isResponse)
     parsed.file.reset(new OEFileRs());
   else
     parsed.file.reset(new OEFileRq());
   OESimpleParser parser;
+  parser.SetReadingOptions(parsed.strict ? OE_READ_STRICT : OE_READ_TOLERANT);
   parsed.status = parser.Parse(&buffer, parsed.file.get(), 0);
   parsed.objectWithError = parser.GetObjectWithError();
+  parsed.audit = ofxkit::AuditParse(buffer, *parsed.file);
   return ExitForStatus(parsed.status);
+}
+
+int ReportLosses(const char* command, const ParsedFile& parsed, int rc) {
+  if (!parsed.audit.complete)
+    std::fprintf(stderr, "ofxkit %s: the file could not be checked for unread data (out of memory)\n", command);
+  for (const ofxkit::AuditFinding& finding : parsed.audit.findings)
+    if (finding.IsLoss()) std::fprintf(stderr, "ofxkit %s: %s\n", command, finding.Describe().c_str());
+  return parsed.audit.HasLoss() && rc == kClean ? kWarnings : rc;
+}
+
+std::string CsvText(const char* text, bool raw) {
+  std::string s(text ? text : "");
+  if (!raw && !s.empty() && std::strchr("=+-@\t\r", s[0])) s.insert(0, 1, '\'');
+  if (s.find_first_of(",\"\r\n") == std::string::npos) return s;
+  std::string quoted = "\"";
+  for (char c : s) quoted += c == '"' ? std::string("\"\"") : std::string(1, c);
+  return quoted + "\"";
 }
 
 const char* TagName(OETagID tag) {

@@ -12,14 +12,16 @@ namespace cli {
 namespace {
 
 const char kPositionsHelp[] =
-    "usage: ofxkit positions [--balances] [--account] FILE\n"
+    "usage: ofxkit positions [--balances] [--account] [--raw] [--strict] FILE\n"
     "Prints the positions of every investment statement of an OFX response file\n"
     "as CSV: security,name,kind,units,unitprice,mktval,priceasof,postype,heldinacct\n"
     "(security is the ticker when the file's security list names one, else the\n"
     "security id). With --balances, prints the cash, margin and short balances\n"
     "and the balance list instead: name,value,type,description,asof.\n"
     "With --account, a first column names the account (broker:account).\n"
-    "Exit status as for 'ofxkit dump'.\n";
+    "--raw and --strict as for 'ofxkit statement'. Positions of the file that\n"
+    "could not be read are reported on standard error, and the exit status is\n"
+    "then never 0. Exit status as for 'ofxkit dump'.\n";
 
 // The present element `tag` of an aggregate as OFX text; empty when absent.
 std::string ElementText(const OEDataObj* obj, OETagID tag) {
@@ -126,7 +128,7 @@ struct Row {
 
 }  // namespace
 
-bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool separate) {
+bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bool separate) {
   std::vector<OEInvStmtRs*> statements;
   CollectInvStatements(root, statements);
   if (statements.empty()) return false;
@@ -140,7 +142,7 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool separat
     OEInvTranList* list = rs->GetInvTranList();
     if (!list) continue;
     list->BuildGenericInvTranList();  // fills the bank transactions' INVTRAN
-    std::string account = withAccount ? Csv(InvAccountName(*rs).c_str()) + "," : "";
+    std::string account = withAccount ? CsvText(InvAccountName(*rs).c_str(), raw) + "," : "";
     std::vector<Row> rows;
     for (unsigned short i = 0, n = list->GetNumberOfChildren(); i < n; ++i) {
       OEDataObj* kind = list->GetChild(i);
@@ -155,13 +157,15 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool separat
       std::string security, name;
       securities.Describe(dynamic_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), security, name);
       std::string total = amounts ? ElementText(amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT) : "";
-      std::string line = Csv(TagName(kind->GetType())) + "," + Csv(security.c_str()) + "," + Csv(name.c_str()) +
+      std::string line = CsvText(TagName(kind->GetType()), raw) + "," + CsvText(security.c_str(), raw) + "," +
+                         CsvText(name.c_str(), raw) +
                          "," + KindText(kind, body, OE_TAG_UNITS) + "," + KindText(kind, body, OE_TAG_UNITPRICE) +
                          "," + KindText(kind, body, OE_TAG_COMMISSION) + "," + total + "," +
                          KindText(kind, body, OE_TAG_SUBACCTSEC) + "," + KindText(kind, body, OE_TAG_SUBACCTFUND) +
                          "," + KindText(kind, body, OE_TAG_SUBACCTFROM) + "," +
                          KindText(kind, body, OE_TAG_SUBACCTTO) + "," +
-                         Csv(tran ? tran->GetFITId().c_str() : "") + "," + Csv(tran ? tran->GetMemo().c_str() : "");
+                         CsvText(tran ? tran->GetFITId().c_str() : "", raw) + "," +
+                         CsvText(tran ? tran->GetMemo().c_str() : "", raw);
       rows.push_back({tran, std::move(line)});
     }
     // Trade-date order; transactions without a date last, each kind's
@@ -189,6 +193,8 @@ int CmdPositions(int argc, char** argv) {
   }
   bool balances = args.Flag("balances");
   bool withAccount = args.Flag("account");
+  bool raw = args.Flag("raw");
+  bool strict = args.Flag("strict");
   std::string error;
   std::vector<std::string> files = args.Positional(&error);
   if (!error.empty() || files.size() != 1) {
@@ -197,6 +203,7 @@ int CmdPositions(int argc, char** argv) {
     return kUsage;
   }
   ParsedFile parsed;
+  parsed.strict = strict;
   int rc = ParseOFXFile(files[0], parsed, &error);
   if (rc == kBadInput) {
     std::fprintf(stderr, "ofxkit positions: %s\n", error.c_str());
@@ -214,7 +221,7 @@ int CmdPositions(int argc, char** argv) {
   else
     std::printf("%ssecurity,name,kind,units,unitprice,mktval,priceasof,postype,heldinacct\n", prefix);
   for (const OEInvStmtRs* rs : statements) {
-    std::string account = withAccount ? Csv(InvAccountName(*rs).c_str()) + "," : "";
+    std::string account = withAccount ? CsvText(InvAccountName(*rs).c_str(), raw) + "," : "";
     if (balances) {
       const OEInvBal* bal = rs->GetInvBal();
       if (!bal) continue;
@@ -225,9 +232,9 @@ int CmdPositions(int argc, char** argv) {
       for (unsigned short i = 0, n = list ? list->GetNumBalance() : 0; i < n; ++i) {
         const OEBalance* b = list->GetBalance(i);
         if (!b) continue;
-        std::printf("%s%s,%s,%s,%s,%s\n", account.c_str(), Csv(b->GetName().c_str()).c_str(),
+        std::printf("%s%s,%s,%s,%s,%s\n", account.c_str(), CsvText(b->GetName().c_str(), raw).c_str(),
                     ElementText(b, OE_TAG_VALUE).c_str(), ElementText(b, OE_TAG_BALTYPE).c_str(),
-                    Csv(b->GetDescription().c_str()).c_str(),
+                    CsvText(b->GetDescription().c_str(), raw).c_str(),
                     b->ValidateTag(OE_TAG_DTASOF) ? IsoDate(b->GetDateAsOf()).c_str() : "");
       }
       continue;
@@ -239,8 +246,8 @@ int CmdPositions(int argc, char** argv) {
       if (!pos) continue;
       std::string security, name;
       securities.Describe(pos->GetSecID(), security, name);
-      std::printf("%s%s,%s,%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), Csv(security.c_str()).c_str(),
-                  Csv(name.c_str()).c_str(), TagName(kind->GetType()), ElementText(pos, OE_TAG_UNITS).c_str(),
+      std::printf("%s%s,%s,%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), CsvText(security.c_str(), raw).c_str(),
+                  CsvText(name.c_str(), raw).c_str(), TagName(kind->GetType()), ElementText(pos, OE_TAG_UNITS).c_str(),
                   ElementText(pos, OE_TAG_UNITPRICE).c_str(), ElementText(pos, OE_TAG_MKTVAL).c_str(),
                   pos->ValidateTag(OE_TAG_DTPRICEASOF) ? IsoDate(pos->GetDtPriceAsOf()).c_str() : "",
                   ElementText(pos, OE_TAG_POSTYPE).c_str(), ElementText(pos, OE_TAG_HELDINACCT).c_str());
@@ -248,7 +255,7 @@ int CmdPositions(int argc, char** argv) {
   }
   if (statements.empty())
     std::fprintf(stderr, "ofxkit positions: no investment statement in %s\n", files[0].c_str());
-  return rc;
+  return ReportLosses("positions", parsed, rc);
 }
 
 }  // namespace cli

@@ -18,6 +18,7 @@ const Command kCommands[] = {
     {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
     {"exchange", cli::CmdExchange, "post a request file to a server (http:, https:) and dump the reply"},
     {"serve", cli::CmdServe, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
+    {"check", cli::CmdCheck, "print the warnings of a file's parse and every part of the file that was not read"},
 };
 
 void Usage(FILE* out) {

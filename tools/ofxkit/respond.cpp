@@ -16,7 +16,9 @@ const char kRespondHelp[] =
     "with N generated transactions (default 25) between the requested dates; an\n"
     "investment statement comes with the security list it refers to. With --user\n"
     "(and the password on standard input) the credentials are checked: a mismatch is\n"
-    "answered with sign-on status 15500 and no statement.\n";
+    "answered with sign-on status 15500 and no statement.\n"
+    "A file is answered with at most 64 statements and 25000 transactions in all;\n"
+    "statement requests beyond that are answered with status 2000 (error).\n";
 
 // A small deterministic generator, so the same request gives the same reply.
 struct Sequence {
@@ -95,6 +97,23 @@ OEGenericStatementRs* MakeStatement(const OEGenericStatementRq& rq, bool card, u
   return rs;
 }
 
+// What one request file may cost. A response is written into one buffer of at
+// most 4,000,000 bytes; a generated transaction takes up to about 130 bytes,
+// so a file is answered with at most kMaxTransactionsPerFile transactions in
+// all, in at most kMaxStatementsPerFile statements. Statement requests beyond
+// either bound are answered with an error status, and inner requests beyond
+// kMaxAnswersPerFile get no answer at all.
+constexpr unsigned kMaxStatementsPerFile = 64;
+constexpr unsigned kMaxAnswersPerFile = 1000;
+
+OETransRs* RefusedStatement(const OETransRq& wrapper, bool card, const char* why) {
+  OETransRs* rsWrapper = new OETransRs();
+  rsWrapper->SetType(card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS);
+  rsWrapper->SetTransUserID(wrapper.GetTransUserID());
+  rsWrapper->SetStatus(NewStatus(2000, OE_SEVERITY_ERROR, why));
+  return rsWrapper;
+}
+
 }  // namespace
 
 bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFileRs& response) {
@@ -102,6 +121,7 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
   OEResponse* out = new OEResponse();
   response.AppendResponse(out);
   bool signedOn = true;
+  unsigned statements = 0, answers = 0, transactions = 0;
   for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
     const OERequest* rq = request.GetRequest(r);
     for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
@@ -136,7 +156,18 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         const OETransRq* wrapper = set->GetTrans(t);
         const OEGenericStatementRq* stmt =
             wrapper ? dynamic_cast<const OEGenericStatementRq*>(wrapper->GetActualTrans()) : nullptr;
-        if (!stmt) continue;
+        if (!stmt || answers >= kMaxAnswersPerFile) continue;
+        ++answers;
+        if (statements >= kMaxStatementsPerFile) {
+          rsSet->AppendTrans(RefusedStatement(*wrapper, card, "Too many statement requests in one file"));
+          continue;
+        }
+        if (transactions + options.transactions > kMaxTransactionsPerFile) {
+          rsSet->AppendTrans(RefusedStatement(*wrapper, card, "Too many transactions requested in one file"));
+          continue;
+        }
+        ++statements;
+        transactions += options.transactions;
         OETransRs* rsWrapper = new OETransRs();
         rsWrapper->SetType(card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS);
         rsWrapper->SetTransUserID(wrapper->GetTransUserID());
@@ -156,8 +187,8 @@ bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options
   if (!count.empty()) {
     char* end = nullptr;
     unsigned long n = std::strtoul(count.c_str(), &end, 10);
-    if (*end || n > 60000) {
-      std::fprintf(stderr, "ofxkit %s: --transactions takes a number up to 60000\n", command);
+    if (*end || n > kMaxTransactionsPerFile) {
+      std::fprintf(stderr, "ofxkit %s: --transactions takes a number up to %u\n", command, kMaxTransactionsPerFile);
       return false;
     }
     options.transactions = static_cast<unsigned>(n);

@@ -295,13 +295,13 @@ class OEAggregate : public OEDataObj {
   void ClearTagQuietly(OETagID tag);
   // How many of the tags are present.
   unsigned short PresentAmong(const std::vector<OETagID>& tags) const;
+  // The field that takes the tag in this class, or null.
+  const OEFieldDesc* FieldAt(OETagID tag) const;
 
  protected:
   // Deletes the children held by the fields this class declares itself.
   void DestroyOwnFields(const OEAggregateInfo& info);
 
- private:
-  const OEFieldDesc* FieldAt(OETagID tag) const;
 };
 
 // An inner aggregate that knows the outer aggregate it belongs to: the
