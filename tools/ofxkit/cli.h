@@ -46,7 +46,16 @@ struct ParsedFile {
 
 // Reads a whole file; false with a message when it cannot.
 bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error);
+// Writes a file, or standard output for "-". A private file (one holding a
+// password or account data) goes through WritePrivateFile.
 bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile = false);
+// Writes buffer to path so that nobody else can read it there at any moment:
+// into a new file of mode 0600 beside path, renamed over it once complete. A
+// symbolic link at path is refused, not followed; a device or pipe
+// (/dev/null) is written into as it is.
+bool WritePrivateFile(const std::string& path, const OEBuffer& buffer, std::string* error);
+// No core dump of this process from now on (it holds a password).
+void KeepSecretsOutOfCoreDumps();
 // Parses an OFX file (request or response, told from its message sets).
 // Returns kBadInput with a message for what is not OFX at all.
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error);
