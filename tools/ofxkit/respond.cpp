@@ -94,13 +94,34 @@ OEGenericStatementRs* MakeStatement(const OEGenericStatementRq& rq, bool card, u
   return rs;
 }
 
+// Whether the request's sign-on is accepted, decided before anything else is
+// answered, wherever the sign-on stands among the message sets: with
+// credentials to check, every sign-on must carry them, and a request
+// without one is refused.
+bool SignOnAccepted(const OEFileRq& request, const RespondOptions& options) {
+  if (!options.checkCredentials) return true;
+  bool seen = false;
+  for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
+    const OERequest* rq = request.GetRequest(r);
+    for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
+      const OEMessageSetRq* set = rq->GetMessageSet(m);
+      if (!set || set->GetType() != OE_TAG_SIGNONMSGSRQV1) continue;
+      const OESignOnRq* signOn = set->GetSignOnRq();
+      if (!signOn || !(signOn->GetUserId() == options.user.c_str()) || !(signOn->GetUserPass() == options.password))
+        return false;
+      seen = true;
+    }
+  }
+  return seen;
+}
+
 }  // namespace
 
 bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFileRs& response) {
   response.SetHeader(OE_HEADER_OFXHEADER, "100");
   OEResponse* out = new OEResponse();
   response.AppendResponse(out);
-  bool signedOn = true;
+  const bool signedOn = SignOnAccepted(request, options);
   for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
     const OERequest* rq = request.GetRequest(r);
     for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
@@ -108,8 +129,6 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
       if (!set) continue;
       if (set->GetType() == OE_TAG_SIGNONMSGSRQV1) {
         const OESignOnRq* signOn = set->GetSignOnRq();
-        if (options.checkCredentials)
-          signedOn = signOn && signOn->GetUserId() == options.user.c_str() && signOn->GetUserPass() == options.password;
         OEMessageSetRs* rsSet = new OEMessageSetRs();
         rsSet->SetType(OE_TAG_SIGNONMSGSRSV1);
         OESignOnRs* signOnRs = new OESignOnRs();
