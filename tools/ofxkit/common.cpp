@@ -236,6 +236,8 @@ const char* TagName(OETagID tag) {
 
 bool PromptPassword(const char* prompt, OEUserPassword& out) {
   KeepSecretsOutOfCoreDumps();
+  // Read byte by byte: no stdio buffer keeps a copy of the line.
+  std::setvbuf(stdin, nullptr, _IONBF, 0);
   bool terminal = isatty(STDIN_FILENO);
   termios saved{};
   if (terminal) {
