@@ -307,6 +307,20 @@ TEST_F(Loopback, ForgedCertificateGetsNoRootEvenWithoutVerification) {
   }
 }
 
+TEST_F(Loopback, WithoutVerificationOnlyDatesAndHostGoUnchecked) {
+  loopback::LeafOptions leaf;
+  leaf.validDays = 0;
+  leaf.altNames = "DNS:elsewhere.example";
+  ASSERT_NO_FATAL_FAILURE(ServeCertificate(leaf));
+  sleep(1);  // past its end
+  EXPECT_NE(Send(URL()), OE_NET_OK);
+  request->SetSSLVerifyCert(0);
+  g_lines.clear();
+  ASSERT_EQ(Send(URL()), OE_NET_OK);
+  EXPECT_TRUE(Logged("GXN: Received trusted root 1 (Vexari Branding CA)"));
+  Reply();
+}
+
 TEST_F(Loopback, HostNamesCheckedAsStrictlyAsCurlDoes) {
   struct Case {
     const char* commonName;

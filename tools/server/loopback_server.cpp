@@ -191,7 +191,7 @@ bool Authority::Reissue(const LeafOptions& leaf, std::string* error) {
   if (!leaf.altNames.empty()) extensions.push_back({NID_subject_alt_name, leaf.altNames.c_str()});
   if (!leaf.forged) extensions.push_back({NID_authority_key_identifier, "keyid"});
   Cert server = MakeCert(im.organisation, leaf.commonName, key.get(), im.ca.get(),
-                         leaf.forged ? stray.get() : im.caKey.get(), 730, extensions,
+                         leaf.forged ? stray.get() : im.caKey.get(), leaf.validDays, extensions,
                          EVP_get_digestbyname(leaf.digest.c_str()));
   if (!server) {
     if (error) *error = OpenSSLError("cannot make certificates");

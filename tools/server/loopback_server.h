@@ -46,6 +46,9 @@ struct LeafOptions {
   std::string altNames = "DNS:localhost,IP:127.0.0.1";  // subjectAltName; empty for none
   // Signed by a stray key while naming the authority as its issuer.
   bool forged = false;
+  // Valid from a day ago for this many days (0: expired a moment after it
+  // is made).
+  long validDays = 730;
 };
 
 // A certificate authority made in memory (RSA, SHA-256), and a server
