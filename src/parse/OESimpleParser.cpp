@@ -24,6 +24,23 @@ void MaskPassword(OEString& value) {
   text[n] = '\0';
   value.UnlockBuffer();
 }
+// The elements whose values are passwords: never shown, in a warning or in
+// the parser's copy.
+bool IsPasswordTag(OETagID tag) {
+  return tag == OE_TAG_USERPASS || tag == OE_TAG_NEWUSERPASS || tag == OE_TAG_TEMPPASS;
+}
+// Masks the texts of the warnings logged from `first` on that name no known
+// tag: after a password element they are pieces of a malformed password
+// (`<USERPASS>Secr3t<Rest0fPass`), read as unknown tags or stray text.
+void MaskWarningsSince(uint32_t first) {
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  for (uint32_t i = first; log && i < log->Entries(); ++i) {
+    OEParseException* record = log->Get(static_cast<unsigned short>(i));
+    if (!record || record->tag != OE_TAG_NONE) continue;
+    MaskPassword(record->value);
+    MaskPassword(record->tagName);
+  }
+}
 // True when, after blanks, the text at `position` is the start tag <OFX>.
 bool AnotherOFXFollows(OEBuffer& buffer, int32_t position) {
   char c;
@@ -111,9 +128,15 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
   OEParseStatus status = OE_PARSE_OK;
   int32_t previous = -1;
   OETagID previousElement = OE_TAG_NONE;
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  bool afterPassword = false;
   while (status == OE_PARSE_OK && previous != OE_TAG_DONE) {
     bool afterElement = previous == OE_TAG_ELEMENT;
+    const uint32_t logged = log ? log->Entries() : 0;
     OETagType kind = engine.GetOETag(entry, value);
+    // Whatever lies between a password tag and the next known tag is secret.
+    if (afterPassword) MaskWarningsSince(logged);
+    afterPassword = (kind == OE_TAG_ELEMENT || kind == OE_TAG_START) && IsPasswordTag(entry.id);
     previous = kind;
     // Warnings take their position from the buffer's offset: keep it just
     // past the item being handled.
@@ -144,7 +167,7 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
           previous = OE_TAG_DONE;
         break;
       case OE_TAG_ELEMENT: {
-        bool password = entry.id == OE_TAG_USERPASS;
+        bool password = IsPasswordTag(entry.id);
         if (!IsValidTag(entry.id)) {
           if (password) MaskPassword(value);
           if (!LogRecord(OEPW_INVALIDELEM, value, entry.name, entry.id)) status = OE_PARSE_NO_PARSER;

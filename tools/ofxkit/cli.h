@@ -51,7 +51,16 @@ struct ParsedFile {
 
 // Reads a whole file; false with a message when it cannot.
 bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error);
+// Writes a file, or standard output for "-". A private file (one holding a
+// password or account data) goes through WritePrivateFile.
 bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile = false);
+// Writes buffer to path so that nobody else can read it there at any moment:
+// into a new file of mode 0600 beside path, renamed over it once complete. A
+// symbolic link at path is refused, not followed; a device or pipe
+// (/dev/null) is written into as it is.
+bool WritePrivateFile(const std::string& path, const OEBuffer& buffer, std::string* error);
+// No core dump of this process from now on (it holds a password).
+void KeepSecretsOutOfCoreDumps();
 // Parses an OFX file (request or response, told from its message sets).
 // Returns kBadInput with a message for what is not OFX at all.
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error);
@@ -94,6 +103,25 @@ bool WriteRequest(const OEFileRq& file, OEBuffer& out);
 // one response buffer), so also the largest --transactions.
 constexpr unsigned kMaxTransactionsPerFile = 25000;
 
+// What answering one request file may still cost: statements, answers and
+// generated transactions (a brokerage transaction counts as the bytes of
+// kBrokerageWeight bank ones).
+struct AnswerBudget {
+  static constexpr unsigned kMaxStatements = 64;
+  static constexpr unsigned kMaxAnswers = 1000;
+  static constexpr unsigned kBrokerageWeight = 3;
+  unsigned statements = 0, answers = 0, transactions = 0;
+  // False when the file has had all the answers it gets (the request is then
+  // not answered at all).
+  bool Answer() { return answers < kMaxAnswers && ++answers; }
+  // Null when a statement of n transactions (each of the given weight) is
+  // still allowed, and counts it; else why it is refused.
+  const char* TakeStatement(unsigned n, unsigned weight = 1);
+};
+
+// The answer to a statement request refused with status 2000 and why.
+OETransRs* RefusedStatement(const OETransRq& wrapper, OETagID wrapperType, const char* why);
+
 // How a request is answered.
 struct RespondOptions {
   unsigned transactions = 25;
@@ -113,7 +141,7 @@ bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options
 bool AskPassword(const char* command, RespondOptions& options);
 // Answers an investment statement or securities-list request set into out
 // (with the security list); false for a set of another type.
-bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, OEResponse& out);
+bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, AnswerBudget& budget, OEResponse& out);
 // Answers request and writes the response file into out; the build status.
 OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out);
 

@@ -1,4 +1,7 @@
 #include <fcntl.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 #include <termios.h>
 #include <unistd.h>
 
@@ -69,6 +72,9 @@ bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
     *error = path + ": " + std::strerror(errno);
     return false;
   }
+  // Straight into chunk, wiped below: no stdio buffer keeps a copy of a
+  // request's password after the file is closed.
+  std::setvbuf(f, nullptr, _IONBF, 0);
   // Room for the whole file at once, rather than growing step by step.
   if (std::fseek(f, 0, SEEK_END) == 0) {
     long size = std::ftell(f);
@@ -91,14 +97,76 @@ bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
     ok = false;
   }
   std::fclose(f);
+  volatile char* wipe = chunk;
+  for (size_t i = 0; i < sizeof chunk; ++i) wipe[i] = 0;
+  return ok;
+}
+
+namespace {
+bool WriteAll(int fd, const char* data, size_t size) {
+  while (size) {
+    ssize_t n = ::write(fd, data, size);
+    if (n < 0 && errno == EINTR) continue;
+    if (n <= 0) return false;
+    data += n;
+    size -= static_cast<size_t>(n);
+  }
+  return true;
+}
+}  // namespace
+
+bool WritePrivateFile(const std::string& path, const OEBuffer& buffer, std::string* error) {
+  const char* data = buffer.GetBufferPtr();
+  const size_t size = data ? buffer.GetBufferSize() : 0;
+  struct stat info;
+  if (::lstat(path.c_str(), &info) == 0) {
+    if (S_ISLNK(info.st_mode)) {
+      *error = path + ": is a symbolic link (not followed; give the file itself)";
+      return false;
+    }
+    if (S_ISDIR(info.st_mode)) {
+      *error = path + ": is a directory";
+      return false;
+    }
+    if (!S_ISREG(info.st_mode)) {
+      // A device or a pipe (/dev/null, a FIFO) keeps nothing: written as it is.
+      int fd = ::open(path.c_str(), O_WRONLY | O_NOFOLLOW | O_CLOEXEC);
+      bool ok = fd >= 0 && WriteAll(fd, data, size);
+      if (!ok) *error = path + ": " + std::strerror(errno);
+      if (fd >= 0) ok = ::close(fd) == 0 && ok;
+      return ok;
+    }
+  }
+  size_t slash = path.rfind('/');
+  std::string folder = slash == std::string::npos ? "." : slash == 0 ? "/" : path.substr(0, slash);
+  std::string base = slash == std::string::npos ? path : path.substr(slash + 1);
+  std::vector<char> temporary;
+  for (char c : folder + (folder == "/" ? "" : "/") + "." + base + ".XXXXXX") temporary.push_back(c);
+  temporary.push_back('\0');
+  int fd = ::mkostemp(temporary.data(), O_CLOEXEC);
+  if (fd < 0) {
+    *error = path + ": " + std::strerror(errno);
+    return false;
+  }
+  bool ok = ::fchmod(fd, S_IRUSR | S_IWUSR) == 0 && WriteAll(fd, data, size) && ::fsync(fd) == 0;
+  int saved = errno;
+  ok = ::close(fd) == 0 && ok;
+  if (ok && std::rename(temporary.data(), path.c_str()) != 0) {
+    saved = errno;
+    ok = false;
+  }
+  if (!ok) {
+    ::unlink(temporary.data());
+    *error = path + ": " + std::strerror(saved);
+  }
   return ok;
 }
 
 bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile) {
+  if (privateFile && path != "-") return WritePrivateFile(path, buffer, error);
   FILE* f = stdout;
   if (path != "-") {
-    // A request holds a password: such a file is readable by its owner only.
-    int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, privateFile ? 0600 : 0644);
+    int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
     f = fd >= 0 ? fdopen(fd, "wb") : nullptr;
     if (fd >= 0 && !f) ::close(fd);
   }
@@ -111,6 +179,12 @@ bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* err
   if (f != stdout) ok = std::fclose(f) == 0 && ok;
   if (!ok) *error = path + ": write error";
   return ok;
+}
+
+void KeepSecretsOutOfCoreDumps() {
+  rlimit none{0, 0};
+  setrlimit(RLIMIT_CORE, &none);
+  prctl(PR_SET_DUMPABLE, 0, 0, 0, 0);
 }
 
 namespace {
@@ -191,6 +265,9 @@ const char* TagName(OETagID tag) {
 }
 
 bool PromptPassword(const char* prompt, OEUserPassword& out) {
+  KeepSecretsOutOfCoreDumps();
+  // Read byte by byte: no stdio buffer keeps a copy of the line.
+  std::setvbuf(stdin, nullptr, _IONBF, 0);
   bool terminal = isatty(STDIN_FILENO);
   termios saved{};
   if (terminal) {

@@ -97,21 +97,52 @@ OEGenericStatementRs* MakeStatement(const OEGenericStatementRq& rq, bool card, u
   return rs;
 }
 
-// What one request file may cost. A response is written into one buffer of at
-// most 4,000,000 bytes; a generated transaction takes up to about 130 bytes,
-// so a file is answered with at most kMaxTransactionsPerFile transactions in
-// all, in at most kMaxStatementsPerFile statements. Statement requests beyond
-// either bound are answered with an error status, and inner requests beyond
-// kMaxAnswersPerFile get no answer at all.
-constexpr unsigned kMaxStatementsPerFile = 64;
-constexpr unsigned kMaxAnswersPerFile = 1000;
+// A response is written into one buffer of at most 4,000,000 bytes; a
+// generated bank transaction takes up to about 130 bytes and a brokerage one
+// about three times that, so a file is answered with at most
+// kMaxTransactionsPerFile (weighted) transactions in all, in at most
+// AnswerBudget::kMaxStatements statements. Statement requests beyond either
+// bound are answered with an error status, and inner requests beyond
+// AnswerBudget::kMaxAnswers get no answer at all.
+}  // namespace
 
-OETransRs* RefusedStatement(const OETransRq& wrapper, bool card, const char* why) {
+const char* AnswerBudget::TakeStatement(unsigned n, unsigned weight) {
+  if (statements >= kMaxStatements) return "Too many statement requests in one file";
+  if (transactions + n * weight > kMaxTransactionsPerFile) return "Too many transactions requested in one file";
+  ++statements;
+  transactions += n * weight;
+  return nullptr;
+}
+
+OETransRs* RefusedStatement(const OETransRq& wrapper, OETagID wrapperType, const char* why) {
   OETransRs* rsWrapper = new OETransRs();
-  rsWrapper->SetType(card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS);
+  rsWrapper->SetType(wrapperType);
   rsWrapper->SetTransUserID(wrapper.GetTransUserID());
   rsWrapper->SetStatus(NewStatus(2000, OE_SEVERITY_ERROR, why));
   return rsWrapper;
+}
+
+namespace {
+
+// Whether the request's sign-on is accepted, decided before anything else is
+// answered, wherever the sign-on stands among the message sets: with
+// credentials to check, every sign-on must carry them, and a request
+// without one is refused.
+bool SignOnAccepted(const OEFileRq& request, const RespondOptions& options) {
+  if (!options.checkCredentials) return true;
+  bool seen = false;
+  for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
+    const OERequest* rq = request.GetRequest(r);
+    for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
+      const OEMessageSetRq* set = rq->GetMessageSet(m);
+      if (!set || set->GetType() != OE_TAG_SIGNONMSGSRQV1) continue;
+      const OESignOnRq* signOn = set->GetSignOnRq();
+      if (!signOn || !(signOn->GetUserId() == options.user.c_str()) || !(signOn->GetUserPass() == options.password))
+        return false;
+      seen = true;
+    }
+  }
+  return seen;
 }
 
 }  // namespace
@@ -120,8 +151,8 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
   response.SetHeader(OE_HEADER_OFXHEADER, "100");
   OEResponse* out = new OEResponse();
   response.AppendResponse(out);
-  bool signedOn = true;
-  unsigned statements = 0, answers = 0, transactions = 0;
+  const bool signedOn = SignOnAccepted(request, options);
+  AnswerBudget budget;
   for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
     const OERequest* rq = request.GetRequest(r);
     for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
@@ -129,8 +160,6 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
       if (!set) continue;
       if (set->GetType() == OE_TAG_SIGNONMSGSRQV1) {
         const OESignOnRq* signOn = set->GetSignOnRq();
-        if (options.checkCredentials)
-          signedOn = signOn && signOn->GetUserId() == options.user.c_str() && signOn->GetUserPass() == options.password;
         OEMessageSetRs* rsSet = new OEMessageSetRs();
         rsSet->SetType(OE_TAG_SIGNONMSGSRSV1);
         OESignOnRs* signOnRs = new OESignOnRs();
@@ -147,7 +176,7 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         out->AppendMessageSet(rsSet);
         continue;
       }
-      if (signedOn && AnswerInvestmentSet(*set, options.transactions, *out)) continue;
+      if (signedOn && AnswerInvestmentSet(*set, options.transactions, budget, *out)) continue;
       bool card = set->GetType() == OE_TAG_CREDITCARDMSGSRQV1;
       if (!signedOn || (set->GetType() != OE_TAG_BANKMSGSRQV1 && !card)) continue;
       OEMessageSetRs* rsSet = new OEMessageSetRs();
@@ -156,18 +185,11 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         const OETransRq* wrapper = set->GetTrans(t);
         const OEGenericStatementRq* stmt =
             wrapper ? dynamic_cast<const OEGenericStatementRq*>(wrapper->GetActualTrans()) : nullptr;
-        if (!stmt || answers >= kMaxAnswersPerFile) continue;
-        ++answers;
-        if (statements >= kMaxStatementsPerFile) {
-          rsSet->AppendTrans(RefusedStatement(*wrapper, card, "Too many statement requests in one file"));
+        if (!stmt || !budget.Answer()) continue;
+        if (const char* refused = budget.TakeStatement(options.transactions)) {
+          rsSet->AppendTrans(RefusedStatement(*wrapper, card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS, refused));
           continue;
         }
-        if (transactions + options.transactions > kMaxTransactionsPerFile) {
-          rsSet->AppendTrans(RefusedStatement(*wrapper, card, "Too many transactions requested in one file"));
-          continue;
-        }
-        ++statements;
-        transactions += options.transactions;
         OETransRs* rsWrapper = new OETransRs();
         rsWrapper->SetType(card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS);
         rsWrapper->SetTransUserID(wrapper->GetTransUserID());

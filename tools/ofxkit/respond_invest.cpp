@@ -295,15 +295,19 @@ OETransRs* AnswerWrapper(const OETransRq& wrapper, OETagID type, OETagID innerTa
 
 }  // namespace
 
-bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, OEResponse& out) {
+bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, AnswerBudget& budget, OEResponse& out) {
   bool statements = set.GetType() == OE_TAG_INVSTMTMSGSRQV1;
   if (!statements && set.GetType() != OE_TAG_SECLISTMSGSRQV1) return false;
   OEMessageSetRs* rsSet = ResponseSet(out, statements ? OE_TAG_INVSTMTMSGSRSV1 : OE_TAG_SECLISTMSGSRSV1);
   bool answered = false;
   for (unsigned short t = 0; t < set.GetNumTrans(); ++t) {
     const OETransRq* wrapper = set.GetTrans(t);
-    if (!wrapper) continue;
+    if (!wrapper || !wrapper->GetActualTrans() || !budget.Answer()) continue;
     if (const auto* rq = dynamic_cast<const OEInvStmtRq*>(wrapper->GetActualTrans())) {
+      if (const char* refused = budget.TakeStatement(transactions, AnswerBudget::kBrokerageWeight)) {
+        rsSet->AppendTrans(RefusedStatement(*wrapper, OE_TAG_INVSTMTTRNRS, refused));
+        continue;
+      }
       rsSet->AppendTrans(AnswerWrapper(*wrapper, OE_TAG_INVSTMTTRNRS, OE_TAG_INVSTMTRS,
                                        MakeInvStatement(*rq, transactions)));
       answered = true;
