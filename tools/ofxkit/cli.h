@@ -89,6 +89,9 @@ struct StatementRequestOptions {
   // and the securities to ask a security list for (comma-separated).
   std::string brokerId, securities;
   bool positions = false, openOrders = false, balance = false;
+  // What is asked besides the sign-on: "statement", "profile" or "accounts"
+  // (since: the date of the last account list the client holds).
+  std::string kind = "statement", since;
 };
 // Writes a sign-on + statement request file into out; false (with a message
 // on standard error) when an option is not valid.
@@ -96,6 +99,15 @@ bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserP
 // Adds the brokerage statement request (and the security-list request) that
 // options name; false after a message when an option is not valid.
 bool AppendInvestmentRequest(const StatementRequestOptions& options, OERequest& request);
+// Appends to request a message set of setType holding one transaction
+// wrapper (a fresh transaction id) around inner.
+void AppendWrapped(OERequest& request, OETagID setType, OETagID wrapperType, OETagID innerTag, OETransBase* inner);
+// The response set of this type in out, appended when there is none yet.
+OEMessageSetRs* ResponseSet(OEResponse& out, OETagID type);
+// A response wrapper (status 0) around inner, answering wrapper.
+OETransRs* AnswerWrapper(const OETransRq& wrapper, OETagID type, OETagID innerTag, OETransBase* inner);
+// Adds the profile or account-information request that options name.
+bool AppendFirstContactRequest(const StatementRequestOptions& options, OERequest& request);
 // Writes a request file strictly into out; false after a message.
 bool WriteRequest(const OEFileRq& file, OEBuffer& out);
 
@@ -122,6 +134,14 @@ struct AnswerBudget {
 // The answer to a statement request refused with status 2000 and why.
 OETransRs* RefusedStatement(const OETransRq& wrapper, OETagID wrapperType, const char* why);
 
+// The accounts `respond` and `serve` list for the demo user.
+constexpr const char* kServedBankID = "121000248";
+constexpr const char* kServedChecking = "1001";
+constexpr const char* kServedSavings = "1002";
+constexpr const char* kServedCard = "4111111111111111";
+constexpr const char* kServedBrokerID = "broker.example";
+constexpr const char* kServedBrokerage = "X12345678";
+
 // How a request is answered.
 struct RespondOptions {
   unsigned transactions = 25;
@@ -142,6 +162,9 @@ bool AskPassword(const char* command, RespondOptions& options);
 // Answers an investment statement or securities-list request set into out
 // (with the security list); false for a set of another type.
 bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, AnswerBudget& budget, OEResponse& out);
+// Answers a profile or signup request set into out; false for a set of
+// another type.
+bool AnswerFirstContactSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);
 // Answers request and writes the response file into out; the build status.
 OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out);
 
@@ -152,6 +175,8 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
 
 int CmdDump(int argc, char** argv);
 int CmdPositions(int argc, char** argv);
+int CmdProfile(int argc, char** argv);
+int CmdAccounts(int argc, char** argv);
 int CmdStatement(int argc, char** argv);
 int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);

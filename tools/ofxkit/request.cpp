@@ -24,7 +24,14 @@ const char kRequestHelp[] =
     "transactions and, with --positions, --open-orders and --balance, for those too;\n"
     "--securities adds a security-list request for the securities named in LIST\n"
     "(comma-separated tickers, or TYPE:ID such as CUSIP:037833100).\n"
-    "Without -o the file goes to standard output.\n";
+    "Without -o the file goes to standard output.\n"
+    "\n"
+    "usage: ofxkit request profile --org ORG --fid FID --user USER [--password-stdin] [-o FILE]\n"
+    "       ofxkit request accounts --org ORG --fid FID --user USER [--since YYYYMMDD]\n"
+    "                               [--password-stdin] [-o FILE]\n"
+    "First contact with an institution: a sign-on and a profile request (what it\n"
+    "supports), or an account-information request (which accounts the user holds;\n"
+    "--since asks only for changes after that date).\n";
 
 bool Fail(const std::string& message) {
   std::fprintf(stderr, "ofxkit request: %s\n", message.c_str());
@@ -64,6 +71,7 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
   signOn->SetAppId(o.appId.c_str());
   if (!signOn->SetAppVer(OEString(o.appVersion.c_str()))) return Fail("--app-version must be a number like 2700");
 
+  if (o.kind != "statement") return AppendFirstContactRequest(o, *request) && WriteRequest(file, out);
   if (o.type == "INVESTMENT") return AppendInvestmentRequest(o, *request) && WriteRequest(file, out);
   bool card = o.type == "CARD";
   OEMessageSetRq* set = new OEMessageSetRq();
@@ -130,8 +138,10 @@ bool WriteRequest(const OEFileRq& file, OEBuffer& out) {
 
 int CmdRequest(int argc, char** argv) {
   Args args(argc, argv, 2);
-  if (args.Flag("help") || argc < 3 || std::strcmp(argv[2], "statement") != 0) {
-    bool asked = argc >= 3 && (!std::strcmp(argv[2], "--help") || !std::strcmp(argv[2], "statement"));
+  const bool known = argc >= 3 && (!std::strcmp(argv[2], "statement") || !std::strcmp(argv[2], "profile") ||
+                                   !std::strcmp(argv[2], "accounts"));
+  if (args.Flag("help") || !known) {
+    bool asked = argc >= 3 && (!std::strcmp(argv[2], "--help") || known);
     std::fputs(kRequestHelp, asked ? stdout : stderr);
     return asked ? kClean : kUsage;
   }
@@ -141,6 +151,7 @@ int CmdRequest(int argc, char** argv) {
     return kClean;
   }
   StatementRequestOptions o;
+  o.kind = argv[2];
   o.org = options.Option("org");
   o.fid = options.Option("fid");
   o.user = options.Option("user");
@@ -155,6 +166,7 @@ int CmdRequest(int argc, char** argv) {
   if (o.type.empty()) o.type = "CHECKING";
   for (char& c : o.type) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
   o.start = options.Option("start");
+  o.since = options.Option("since");
   o.end = options.Option("end");
   o.appId = options.Option("app-id");
   if (o.appId.empty()) o.appId = "QWIN";
@@ -165,10 +177,13 @@ int CmdRequest(int argc, char** argv) {
   bool passwordFromStdin = options.Flag("password-stdin");
   std::string error;
   std::vector<std::string> rest = options.Positional(&error);
-  if (!error.empty() || !rest.empty() || o.org.empty() || o.user.empty() || o.account.empty()) {
+  if (!error.empty() || !rest.empty() || o.org.empty() || o.user.empty() ||
+      (o.kind == "statement" && o.account.empty())) {
     std::fprintf(stderr, "ofxkit request: %s\n%s",
                  !error.empty() ? error.c_str() : !rest.empty() ? "unexpected arguments"
-                                                                : "--org, --user and --account are needed",
+                                                                : o.kind == "statement"
+                                                                      ? "--org, --user and --account are needed"
+                                                                      : "--org and --user are needed",
                  kRequestHelp);
     return kUsage;
   }

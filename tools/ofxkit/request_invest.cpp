@@ -12,21 +12,6 @@ bool Fail(const std::string& message) {
   return false;
 }
 
-// A message set of the request holding one transaction wrapper around inner.
-void AppendWrapped(OERequest& request, OETagID setType, OETagID wrapperType, OETagID innerTag, OETransBase* inner) {
-  OEMessageSetRq* set = new OEMessageSetRq();
-  set->SetType(setType);
-  request.AppendMessageSet(set);
-  OETransRq* wrapper = new OETransRq();
-  wrapper->SetType(wrapperType);
-  set->AppendTrans(wrapper);
-  char trnuid[OEUtility::kTransactionIDLength + 1];
-  OEUtility::GenerateTransactionID(trnuid);
-  wrapper->SetTransUserID(trnuid);
-  wrapper->SetActualTrans(inner);
-  wrapper->SetTag(innerTag);
-}
-
 // One SECRQ: by ticker, or by identifier when the text is TYPE:ID.
 OESecRq* SecurityRequest(const std::string& spec) {
   OESecRq* rq = new OESecRq();
@@ -43,6 +28,21 @@ OESecRq* SecurityRequest(const std::string& spec) {
 }
 
 }  // namespace
+
+// A message set of the request holding one transaction wrapper around inner.
+void AppendWrapped(OERequest& request, OETagID setType, OETagID wrapperType, OETagID innerTag, OETransBase* inner) {
+  OEMessageSetRq* set = new OEMessageSetRq();
+  set->SetType(setType);
+  request.AppendMessageSet(set);
+  OETransRq* wrapper = new OETransRq();
+  wrapper->SetType(wrapperType);
+  set->AppendTrans(wrapper);
+  char trnuid[OEUtility::kTransactionIDLength + 1];
+  OEUtility::GenerateTransactionID(trnuid);
+  wrapper->SetTransUserID(trnuid);
+  wrapper->SetActualTrans(inner);
+  wrapper->SetTag(innerTag);
+}
 
 bool AppendInvestmentRequest(const StatementRequestOptions& o, OERequest& request) {
   if (o.brokerId.empty()) return Fail("--broker-id is needed for a brokerage account");

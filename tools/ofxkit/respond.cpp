@@ -176,7 +176,9 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         out->AppendMessageSet(rsSet);
         continue;
       }
-      if (signedOn && AnswerInvestmentSet(*set, options.transactions, budget, *out)) continue;
+      if (signedOn && (AnswerInvestmentSet(*set, options.transactions, budget, *out) ||
+                       AnswerFirstContactSet(*set, budget, *out)))
+        continue;
       bool card = set->GetType() == OE_TAG_CREDITCARDMSGSRQV1;
       if (!signedOn || (set->GetType() != OE_TAG_BANKMSGSRQV1 && !card)) continue;
       OEMessageSetRs* rsSet = new OEMessageSetRs();

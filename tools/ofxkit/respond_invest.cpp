@@ -270,6 +270,8 @@ OESecList* MakeSecList() {
   return list;
 }
 
+}  // namespace
+
 // The response set of this type, appended when there is none yet.
 OEMessageSetRs* ResponseSet(OEResponse& out, OETagID type) {
   for (unsigned short m = 0; m < out.GetNumMessage(); ++m)
@@ -292,8 +294,6 @@ OETransRs* AnswerWrapper(const OETransRq& wrapper, OETagID type, OETagID innerTa
   rs->SetTag(innerTag);
   return rs;
 }
-
-}  // namespace
 
 bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, AnswerBudget& budget, OEResponse& out) {
   bool statements = set.GetType() == OE_TAG_INVSTMTMSGSRQV1;
