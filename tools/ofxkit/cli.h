@@ -173,6 +173,25 @@ OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options
 // false when there are none.
 bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bool separate);
 
+// What every command that reads one file does first: --help (printing help),
+// --raw (when raw is given) and --strict, the one FILE, its parse and the
+// messages for a file that is not OFX or whose parse stopped. False with *rc
+// the exit status when the command ends here; else true with *rc the exit
+// status of the parse.
+bool ParseCommandFile(const char* command, const char* help, Args& args, ParsedFile& parsed, bool* raw, int* rc);
+
+// The objects of class T anywhere under obj, in document order (not looking
+// inside one that is found).
+template <class T>
+void Collect(const OEDataObj* obj, std::vector<const T*>& out) {
+  if (const T* found = dynamic_cast<const T*>(obj)) {
+    out.push_back(found);
+    return;
+  }
+  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
+    if (const OEDataObj* child = obj->GetChild(i)) Collect(child, out);
+}
+
 int CmdDump(int argc, char** argv);
 int CmdPositions(int argc, char** argv);
 int CmdProfile(int argc, char** argv);

@@ -293,4 +293,32 @@ bool PromptPassword(const char* prompt, OEUserPassword& out) {
   return ok && !out.IsEmpty();
 }
 
+// Parses FILE for a command: false with *rc the exit status when the command
+// ends here, else true with *rc the parse's exit status.
+bool ParseCommandFile(const char* command, const char* help, Args& args, ParsedFile& parsed, bool* raw, int* rc) {
+  *rc = kClean;
+  if (args.Flag("help")) {
+    std::fputs(help, stdout);
+    return false;
+  }
+  if (raw) *raw = args.Flag("raw");
+  parsed.strict = args.Flag("strict");
+  std::string error;
+  std::vector<std::string> files = args.Positional(&error);
+  if (!error.empty() || files.size() != 1) {
+    std::fprintf(stderr, "ofxkit %s: %s\n%s", command, error.empty() ? "expected one FILE" : error.c_str(), help);
+    *rc = kUsage;
+    return false;
+  }
+  *rc = ParseOFXFile(files[0], parsed, &error);
+  if (*rc == kBadInput) {
+    std::fprintf(stderr, "ofxkit %s: %s\n", command, error.c_str());
+    return false;
+  }
+  if (*rc == kParseFailed)
+    std::fprintf(stderr, "ofxkit %s: the parse stopped early (status %d); what was read is shown\n", command,
+                 static_cast<int>(parsed.status));
+  return true;
+}
+
 }  // namespace cli

@@ -27,17 +27,6 @@ const char kAccountsHelp[] =
     "checking of a brokerage account). --raw and --strict as for 'ofxkit\n"
     "statement'. Exit status as for 'ofxkit dump'.\n";
 
-// The inner responses of one class anywhere under obj, in document order.
-template <class T>
-void Collect(const OEDataObj* obj, std::vector<const T*>& out) {
-  if (const T* found = dynamic_cast<const T*>(obj)) {
-    out.push_back(found);
-    return;
-  }
-  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
-    if (const OEDataObj* child = obj->GetChild(i)) Collect(child, out);
-}
-
 // The OFX text of a present element, or `absent`.
 std::string Text(const OEAggregate& obj, OETagID tag, const char* absent = "") {
   const OEFieldDesc* d = obj.FieldAt(tag);
@@ -54,34 +43,6 @@ std::string Join(const std::vector<std::string>& parts, const char* separator) {
     out += part;
   }
   return out;
-}
-
-// Parses FILE for a command: false with *rc the exit status when the command
-// ends here, else true with *rc the parse's exit status.
-bool ParseFor(const char* command, const char* help, Args& args, ParsedFile& parsed, bool* raw, int* rc) {
-  *rc = kClean;
-  if (args.Flag("help")) {
-    std::fputs(help, stdout);
-    return false;
-  }
-  if (raw) *raw = args.Flag("raw");
-  parsed.strict = args.Flag("strict");
-  std::string error;
-  std::vector<std::string> files = args.Positional(&error);
-  if (!error.empty() || files.size() != 1) {
-    std::fprintf(stderr, "ofxkit %s: %s\n%s", command, error.empty() ? "expected one FILE" : error.c_str(), help);
-    *rc = kUsage;
-    return false;
-  }
-  *rc = ParseOFXFile(files[0], parsed, &error);
-  if (*rc == kBadInput) {
-    std::fprintf(stderr, "ofxkit %s: %s\n", command, error.c_str());
-    return false;
-  }
-  if (*rc == kParseFailed)
-    std::fprintf(stderr, "ofxkit %s: the parse stopped early (status %d); what was read is shown\n", command,
-                 static_cast<int>(parsed.status));
-  return true;
 }
 
 void PrintRealm(const OESignOnInfo& info) {
@@ -347,7 +308,7 @@ int CmdProfile(int argc, char** argv) {
   Args args(argc, argv, 2);
   ParsedFile parsed;
   int rc;
-  if (!ParseFor("profile", kProfileHelp, args, parsed, nullptr, &rc)) return rc;
+  if (!ParseCommandFile("profile", kProfileHelp, args, parsed, nullptr, &rc)) return rc;
   std::vector<const OEProfileRs*> profiles;
   Collect(parsed.file.get(), profiles);
   for (size_t i = 0; i < profiles.size(); ++i) {
@@ -363,7 +324,7 @@ int CmdAccounts(int argc, char** argv) {
   ParsedFile parsed;
   bool raw = false;
   int rc;
-  if (!ParseFor("accounts", kAccountsHelp, args, parsed, &raw, &rc)) return rc;
+  if (!ParseCommandFile("accounts", kAccountsHelp, args, parsed, &raw, &rc)) return rc;
   std::vector<const OEAccountInfoRs*> lists;
   Collect(parsed.file.get(), lists);
   std::printf("kind,bankid,acctid,type,description,status,supports\n");

@@ -67,7 +67,12 @@ std::string IsoDate(const OEDateTime& d) {
 // The securities that the file's security lists describe, by id.
 class Securities {
  public:
-  explicit Securities(const OEDataObj* root) { Collect(root); }
+  explicit Securities(const OEDataObj* root) {
+    std::vector<const OEMessageSetRs*> sets;
+    cli::Collect(root, sets);
+    for (const OEMessageSetRs* set : sets)
+      if (const OESecList* list = set->GetSecList()) Add(*list);
+  }
 
   // "ticker" (or the id when no ticker is known) and the security's name.
   void Describe(const OESecID* id, std::string& security, std::string& name) const {
@@ -86,14 +91,6 @@ class Securities {
   static std::string Key(const OESecID& id) {
     return std::string(id.GetUniqueIDType().c_str()) + ":" + id.GetUniqueID().c_str();
   }
-  void Collect(const OEDataObj* obj) {
-    if (const auto* set = dynamic_cast<const OEMessageSetRs*>(obj)) {
-      if (const OESecList* list = set->GetSecList()) Add(*list);
-      return;
-    }
-    for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
-      if (const OEDataObj* child = obj->GetChild(i)) Collect(child);
-  }
   void Add(const OESecList& list) {
     for (unsigned short i = 0, n = list.GetNumberOfChildren(); i < n; ++i) {
       const OEDataObj* kind = list.GetChild(i);
@@ -104,16 +101,6 @@ class Securities {
   }
   std::map<std::string, std::pair<std::string, std::string>> m_byId;
 };
-
-// Investment statement responses anywhere in the tree, in document order.
-void CollectInvStatements(OEDataObj* obj, std::vector<OEInvStmtRs*>& out) {
-  if (auto* rs = dynamic_cast<OEInvStmtRs*>(obj)) {
-    out.push_back(rs);
-    return;
-  }
-  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
-    if (OEDataObj* child = obj->GetChild(i)) CollectInvStatements(child, out);
-}
 
 std::string InvAccountName(const OEInvStmtRs& rs) {
   const OEInvAcctFrom* account = rs.GetInvAcctFrom();
@@ -129,8 +116,8 @@ struct Row {
 }  // namespace
 
 bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bool separate) {
-  std::vector<OEInvStmtRs*> statements;
-  CollectInvStatements(root, statements);
+  std::vector<const OEInvStmtRs*> statements;
+  Collect(root, statements);
   if (statements.empty()) return false;
   Securities securities(root);
   if (separate) std::printf("\n");
@@ -138,7 +125,7 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       "%sdate,kind,security,name,units,unitprice,commission,total,subacctsec,subacctfund,subacctfrom,subacctto,"
       "fitid,memo\n",
       withAccount ? "account," : "");
-  for (OEInvStmtRs* rs : statements) {
+  for (const OEInvStmtRs* rs : statements) {
     OEInvTranList* list = rs->GetInvTranList();
     if (!list) continue;
     list->BuildGenericInvTranList();  // fills the bank transactions' INVTRAN
@@ -187,33 +174,14 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
 
 int CmdPositions(int argc, char** argv) {
   Args args(argc, argv, 2);
-  if (args.Flag("help")) {
-    std::fputs(kPositionsHelp, stdout);
-    return kClean;
-  }
   bool balances = args.Flag("balances");
   bool withAccount = args.Flag("account");
-  bool raw = args.Flag("raw");
-  bool strict = args.Flag("strict");
-  std::string error;
-  std::vector<std::string> files = args.Positional(&error);
-  if (!error.empty() || files.size() != 1) {
-    std::fprintf(stderr, "ofxkit positions: %s\n%s", error.empty() ? "expected one FILE" : error.c_str(),
-                 kPositionsHelp);
-    return kUsage;
-  }
+  bool raw = false;
   ParsedFile parsed;
-  parsed.strict = strict;
-  int rc = ParseOFXFile(files[0], parsed, &error);
-  if (rc == kBadInput) {
-    std::fprintf(stderr, "ofxkit positions: %s\n", error.c_str());
-    return rc;
-  }
-  if (rc == kParseFailed)
-    std::fprintf(stderr, "ofxkit positions: the parse stopped early (status %d); what was read is shown\n",
-                 static_cast<int>(parsed.status));
-  std::vector<OEInvStmtRs*> statements;
-  CollectInvStatements(parsed.file.get(), statements);
+  int rc;
+  if (!ParseCommandFile("positions", kPositionsHelp, args, parsed, &raw, &rc)) return rc;
+  std::vector<const OEInvStmtRs*> statements;
+  Collect(parsed.file.get(), statements);
   Securities securities(parsed.file.get());
   const char* prefix = withAccount ? "account," : "";
   if (balances)
@@ -254,7 +222,7 @@ int CmdPositions(int argc, char** argv) {
     }
   }
   if (statements.empty())
-    std::fprintf(stderr, "ofxkit positions: no investment statement in %s\n", files[0].c_str());
+    std::fprintf(stderr, "ofxkit positions: no investment statement in the file\n");
   return ReportLosses("positions", parsed, rc);
 }
 

@@ -13,16 +13,16 @@ bool Fail(const std::string& message) {
 }
 
 // One SECRQ: by ticker, or by identifier when the text is TYPE:ID.
-OESecRq* SecurityRequest(const std::string& spec) {
+OESecRq* SecurityRequest(const std::string& named) {
   OESecRq* rq = new OESecRq();
-  size_t colon = spec.find(':');
+  size_t colon = named.find(':');
   if (colon == std::string::npos) {
-    rq->SetTicker(spec.c_str());
+    rq->SetTicker(named.c_str());
     return rq;
   }
   OESecID* id = new OESecID();
-  id->SetUniqueIDType(spec.substr(0, colon).c_str());
-  id->SetUniqueID(spec.substr(colon + 1).c_str());
+  id->SetUniqueIDType(named.substr(0, colon).c_str());
+  id->SetUniqueID(named.substr(colon + 1).c_str());
   rq->SetSecID(id);
   return rq;
 }
@@ -71,8 +71,8 @@ bool AppendInvestmentRequest(const StatementRequestOptions& o, OERequest& reques
   size_t start = 0;
   while (start <= o.securities.size()) {
     size_t comma = o.securities.find(',', start);
-    std::string spec = o.securities.substr(start, comma == std::string::npos ? std::string::npos : comma - start);
-    if (!spec.empty()) list->AppendSecRq(SecurityRequest(spec));
+    std::string named = o.securities.substr(start, comma == std::string::npos ? std::string::npos : comma - start);
+    if (!named.empty()) list->AppendSecRq(SecurityRequest(named));
     if (comma == std::string::npos) break;
     start = comma + 1;
   }

@@ -36,17 +36,6 @@ std::string Amount(const OEBankStatementTx& tx) {
   return tx.ValidateTag(OE_TAG_TRNAMT) && OEValueText(tx.GetTxAmount(), text) ? text.c_str() : "";
 }
 
-// Statement responses (bank or card) anywhere in the tree, in document order.
-void CollectStatements(const OEDataObj* obj, std::vector<const OEGenericStatementRs*>& out) {
-  if (const OEGenericStatementRs* rs = dynamic_cast<const OEGenericStatementRs*>(obj)) {
-    out.push_back(rs);
-    return;
-  }
-  unsigned short n = obj->GetNumberOfChildren();
-  for (unsigned short i = 0; i < n; ++i)
-    if (const OEDataObj* child = obj->GetChild(i)) CollectStatements(child, out);
-}
-
 std::string AccountName(const OEGenericStatementRs& rs) {
   const OEBankOrCCAccount* account = rs.GetAccountFrom();
   if (!account) return "";
@@ -59,32 +48,13 @@ std::string AccountName(const OEGenericStatementRs& rs) {
 
 int CmdStatement(int argc, char** argv) {
   Args args(argc, argv, 2);
-  if (args.Flag("help")) {
-    std::fputs(kStatementHelp, stdout);
-    return kClean;
-  }
   bool withAccount = args.Flag("account");
-  bool raw = args.Flag("raw");
-  bool strict = args.Flag("strict");
-  std::string error;
-  std::vector<std::string> files = args.Positional(&error);
-  if (!error.empty() || files.size() != 1) {
-    std::fprintf(stderr, "ofxkit statement: %s\n%s", error.empty() ? "expected one FILE" : error.c_str(),
-                 kStatementHelp);
-    return kUsage;
-  }
+  bool raw = false;
   ParsedFile parsed;
-  parsed.strict = strict;
-  int rc = ParseOFXFile(files[0], parsed, &error);
-  if (rc == kBadInput) {
-    std::fprintf(stderr, "ofxkit statement: %s\n", error.c_str());
-    return rc;
-  }
-  if (rc == kParseFailed)
-    std::fprintf(stderr, "ofxkit statement: the parse stopped early (status %d); what was read is shown\n",
-                 static_cast<int>(parsed.status));
+  int rc;
+  if (!ParseCommandFile("statement", kStatementHelp, args, parsed, &raw, &rc)) return rc;
   std::vector<const OEGenericStatementRs*> statements;
-  CollectStatements(parsed.file.get(), statements);
+  Collect(parsed.file.get(), statements);
   if (!statements.empty()) std::printf("%sdate,amount,type,fitid,name,memo,checknum\n", withAccount ? "account," : "");
   for (const OEGenericStatementRs* rs : statements) {
     const OEBankTransactionList* list = rs->GetBankTransactionList();
@@ -102,7 +72,7 @@ int CmdStatement(int argc, char** argv) {
   }
   bool investments = PrintInvestmentTransactions(parsed.file.get(), withAccount, raw, !statements.empty());
   if (statements.empty() && !investments)
-    std::fprintf(stderr, "ofxkit statement: no bank, card or investment statement in %s\n", files[0].c_str());
+    std::fprintf(stderr, "ofxkit statement: no bank, card or investment statement in the file\n");
   return ReportLosses("statement", parsed, rc);
 }
 
