@@ -1,7 +1,10 @@
 #include <gtest/gtest.h>
 
+#include <cerrno>
+#include <cstdio>
 #include <cstring>
 #include <string>
+#include <utility>
 
 #include "ofxkit/ofxkit.h"
 
@@ -140,6 +143,91 @@ TEST(OEString, SpecialLimits) {
   multi.SetSpecLength(12);
   multi = OEString("abc");
   EXPECT_EQ(multi.SpecLength(), 12);
+}
+
+// The limit belongs to the target in every assignment, also through a
+// reference to the base class and from a temporary.
+TEST(OEString, LimitBelongsToTheTargetThroughABaseReference) {
+  const std::string forty(40, 'x');
+  OEString32 s;
+  OEString& r = s;
+  r = OEString(forty.c_str());
+  EXPECT_EQ(s.SpecLength(), 32);
+  EXPECT_FALSE(s.IsValid());
+  EXPECT_EQ(s.GetStrLength(), 40);
+
+  OEMultiLenString multi;
+  multi.SetSpecLength(10);
+  OEString& m = multi;
+  m = OEString("01234567890123");
+  EXPECT_EQ(multi.SpecLength(), 10);
+  EXPECT_FALSE(multi.IsValid());
+
+  OEEMailMsgBody body;
+  OEString tenThousand("text");
+  tenThousand.SetSpecLength(10000);
+  static_cast<OEString&>(body) = std::move(tenThousand);
+  EXPECT_EQ(body.SpecLength(), 10000);
+
+  OEUserPassword password;
+  static_cast<OEString&>(password) = OEString(forty.c_str());
+  EXPECT_EQ(password.SpecLength(), 171);
+  EXPECT_EQ(password.GetStrLength(), 40);
+
+  // A plain string still takes everything from a temporary.
+  OEString plain;
+  OEString32 source("abc");
+  plain = std::move(source);
+  EXPECT_EQ(plain.SpecLength(), 32);
+  EXPECT_EQ(plain, "abc");
+  EXPECT_TRUE(source.IsNull());
+}
+
+// Short texts live inside the string and long ones on the heap; the block
+// behaves the same on both sides of that line and across it.
+TEST(OEString, StorageAcrossTheInlineBoundary) {
+  const int inlineBlock = OEString::kInlineBlock;
+  for (int n : {1, 2, inlineBlock - 1, inlineBlock, inlineBlock + 1, 200}) {
+    SCOPED_TRACE(n);
+    const std::string text(static_cast<size_t>(n - 1), 'a');
+    OEString s(text.c_str());
+    EXPECT_EQ(s.BufferSize(), text.empty() ? 0 : n);
+    EXPECT_EQ(std::string(s.c_str()), text);
+
+    // Growing one character at a time keeps the text and exact fit.
+    OEString grown;
+    for (size_t i = 0; i < text.size(); ++i) grown += 'a';
+    EXPECT_EQ(grown, s);
+    EXPECT_EQ(grown.BufferSize(), s.BufferSize());
+
+    // Copies and moves carry the text whichever side it is on.
+    OEString copy(s);
+    OEString moved(std::move(copy));
+    EXPECT_EQ(moved, s);
+    EXPECT_TRUE(copy.IsNull());
+    OEString assigned;
+    assigned = std::move(moved);
+    EXPECT_EQ(assigned, s);
+
+    // Clear fills the whole block, wherever it is.
+    if (!text.empty()) {
+      assigned.Clear('*');
+      EXPECT_EQ(std::string(assigned.c_str()), std::string(static_cast<size_t>(n - 1), '*'));
+    }
+  }
+  // Assigning part of itself, across the line.
+  OEString self("0123456789012345678901234567890123456789");
+  self = self + 30;
+  EXPECT_EQ(self, "0123456789");
+  self += self;
+  EXPECT_EQ(self, "01234567890123456789");
+  self.Append(self.c_str(), self.GetStrLength());
+  EXPECT_EQ(self, "0123456789012345678901234567890123456789");
+  // The block never shrinks while text is held.
+  EXPECT_EQ(self.BufferSize(), 41);
+  self = "ab";
+  EXPECT_EQ(self.BufferSize(), 41);
+  EXPECT_EQ(self, "ab");
 }
 
 TEST(OEBuffer, GrowthAndCeiling) {
