@@ -230,6 +230,53 @@ TEST(OEString, StorageAcrossTheInlineBoundary) {
   EXPECT_EQ(self, "ab");
 }
 
+TEST(OELargeBuffer, CeilingIsChosenWhenMade) {
+  std::string bytes(5000000, 'b');
+  OELargeBuffer large(6000000, 0);
+  EXPECT_EQ(large.WriteLarge(bytes.data(), 5000000), OEBUF_OK);
+  EXPECT_EQ(large.GetBufferSize(), 5000000u);
+  EXPECT_EQ(large.WriteLarge(bytes.data(), 999999), OEBUF_OK);
+  EXPECT_EQ(large.Write('x'), OEBUF_OUTOFRANGE);  // would end at the ceiling
+  EXPECT_EQ(large.GetBufferSize(), 5999999u);
+  EXPECT_EQ(large.GetCh(5999998), 'b');
+  OEBuffer plain;
+  EXPECT_EQ(plain.WriteLarge(bytes.data(), 5000000), OEBUF_OUTOFRANGE);
+}
+
+TEST(OELargeBuffer, WholeFilesOfAnySizeAreRead) {
+  const std::string path = ::testing::TempDir() + "ofxkit_read_file_test.bin";
+  std::string content(4500000, 'q');
+  content[0] = '<';
+  content[4499999] = '>';
+  FILE* f = fopen(path.c_str(), "wb");
+  ASSERT_NE(f, nullptr);
+  ASSERT_EQ(fwrite(content.data(), 1, content.size(), f), content.size());
+  fclose(f);
+  int error = -1;
+  OEBuffer* buffer = OEReadFileIntoBuffer(path.c_str(), &error);
+  ASSERT_NE(buffer, nullptr);
+  EXPECT_EQ(error, 0);
+  EXPECT_EQ(buffer->GetBufferSize(), 4500000u);
+  EXPECT_EQ(buffer->GetBufferOffset(), 0u);
+  EXPECT_EQ(memcmp(buffer->GetBufferPtr(), content.data(), content.size()), 0);
+  delete buffer;
+
+  f = fopen(path.c_str(), "wb");
+  fclose(f);
+  buffer = OEReadFileIntoBuffer(path.c_str(), &error);
+  ASSERT_NE(buffer, nullptr);  // an empty file is an empty buffer
+  EXPECT_EQ(buffer->GetBufferSize(), 0u);
+  delete buffer;
+  remove(path.c_str());
+
+  EXPECT_EQ(OEReadFileIntoBuffer(path.c_str(), &error), nullptr);
+  EXPECT_EQ(error, ENOENT);
+  EXPECT_EQ(OEReadFileIntoBuffer(::testing::TempDir().c_str(), &error), nullptr);  // a directory
+  EXPECT_NE(error, 0);
+  EXPECT_EQ(OEReadFileIntoBuffer(nullptr, &error), nullptr);
+  EXPECT_EQ(error, EINVAL);
+}
+
 TEST(OEBuffer, GrowthAndCeiling) {
   OEBuffer b;
   EXPECT_EQ(b.GetBufferAllocation(), 512u);
