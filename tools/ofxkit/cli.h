@@ -93,5 +93,7 @@ int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
 int CmdExchange(int argc, char** argv);
 int CmdServe(int argc, char** argv);
+// Runs a command of the network module (exchange, serve), loading it first.
+int RunNetCommand(const char* name, int argc, char** argv);
 
 }  // namespace cli

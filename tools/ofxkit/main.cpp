@@ -5,6 +5,10 @@
 #include "cli.h"
 
 namespace {
+// The network commands are loaded when they run (see net_loader.cpp).
+int Exchange(int argc, char** argv) { return cli::RunNetCommand("exchange", argc, argv); }
+int Serve(int argc, char** argv) { return cli::RunNetCommand("serve", argc, argv); }
+
 struct Command {
   const char* name;
   int (*run)(int, char**);
@@ -15,8 +19,8 @@ const Command kCommands[] = {
     {"statement", cli::CmdStatement, "print the transactions of bank and card statements as CSV"},
     {"request", cli::CmdRequest, "write an OFX request file (request statement ...)"},
     {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
-    {"exchange", cli::CmdExchange, "post a request file to a server (http:, https:) and dump the reply"},
-    {"serve", cli::CmdServe, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
+    {"exchange", Exchange, "post a request file to a server (http:, https:) and dump the reply"},
+    {"serve", Serve, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
 };
 
 void Usage(FILE* out) {
