@@ -133,9 +133,14 @@ int ExitForStatus(OEParseStatus status) {
 }
 
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error) {
-  OEBuffer buffer;
-  if (!ReadFile(path, buffer, error)) return kBadInput;
-  return ParseOFXBuffer(buffer, path, parsed, error);
+  // A buffer as large as the file, however large that is.
+  int failure = 0;
+  std::unique_ptr<OEBuffer> buffer(OEReadFileIntoBuffer(path.c_str(), &failure));
+  if (!buffer) {
+    *error = path + ": " + (failure == EFBIG ? "too large (files of up to 2 GB can be read)" : std::strerror(failure));
+    return kBadInput;
+  }
+  return ParseOFXBuffer(*buffer, path, parsed, error);
 }
 
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error) {

@@ -3,6 +3,7 @@
 #include <nlohmann/json.hpp>
 #include <string>
 
+#include "charset.h"
 #include "cli.h"
 
 namespace cli {
@@ -15,6 +16,11 @@ const char kDumpHelp[] =
     "  --json   print the same as one JSON document\n"
     "Exit status: 0 clean parse, 1 parsed with warnings, 2 parse failed, 3 unreadable\n"
     "or not OFX, 64 bad command line.\n";
+
+// The file's text as UTF-8 (set while a dump runs).
+Utf8Converter* g_text = nullptr;
+
+std::string Utf8(const char* text, const char* field) { return g_text ? (*g_text)(text, field) : text; }
 
 // One element value of an object, as the tree shows it.
 struct Element {
@@ -38,22 +44,22 @@ std::vector<Element> ElementsOf(const OEDataObj* obj) {
       if (tag == OE_TAG_USERPASS || tag == OE_TAG_NEWUSERPASS) {
         out.push_back({tag, "(hidden)"});
       } else if (d->text(agg, k, text)) {
-        out.push_back({tag, text.c_str()});
+        out.push_back({tag, Utf8(text.c_str(), TagName(tag))});
       }
     }
   }
   return out;
 }
 
+const char* HeaderName(int32_t h) { return OEDataConversion::Text(static_cast<OEHeaderTag>(h)); }
+
 void HeadersOf(const OEDataObj* obj, std::vector<Element>& out) {
   const OEFileOFX* file = dynamic_cast<const OEFileOFX*>(obj);
   if (!file) return;
   for (int32_t h = OE_HEADER_OFXHEADER; h <= OE_HEADER_NEWFILEUID; ++h)
     if (const OEString* value = file->GetHeader(static_cast<OEHeaderTag>(h)))
-      out.push_back({static_cast<OETagID>(h), value->c_str()});
+      out.push_back({static_cast<OETagID>(h), Utf8(value->c_str(), HeaderName(h))});
 }
-
-const char* HeaderName(int32_t h) { return OEDataConversion::Text(static_cast<OEHeaderTag>(h)); }
 
 void DumpText(const OEDataObj* obj, int depth, FILE* out) {
   std::string indent(static_cast<size_t>(depth) * 2, ' ');
@@ -109,8 +115,8 @@ void DumpJson(const OEDataObj* obj, FILE* out) {
 
 nlohmann::json WarningJson(const OEParseException& w) {
   return {{"code", OEParseException::WarningName(w.warning)},
-          {"tag", w.tag ? TagName(w.tag) : w.tagName.c_str()},
-          {"value", w.value.c_str()},
+          {"tag", w.tag ? TagName(w.tag) : Utf8(w.tagName.c_str(), "a warning")},
+          {"value", Utf8(w.value.c_str(), "a warning")},
           {"position", w.position}};
 }
 
@@ -135,6 +141,8 @@ int CmdDump(int argc, char** argv) {
     std::fprintf(stderr, "ofxkit dump: %s\n", error.c_str());
     return rc;
   }
+  Utf8Converter text(CharsetOf(*parsed.file));
+  g_text = &text;
   OEParseLogger* log = OEParseLogger::TheOEParseLogger();
   if (json) {
     std::fprintf(stdout, "{\"status\":%d,\"tree\":", static_cast<int>(parsed.status));
@@ -151,9 +159,12 @@ int CmdDump(int argc, char** argv) {
     for (unsigned short i = 0; i < log->Entries(); ++i) {
       const OEParseException* w = log->Get(i);
       std::fprintf(stdout, "  %s tag=%s value=\"%s\" position=%d\n", OEParseException::WarningName(w->warning),
-                   w->tag ? TagName(w->tag) : w->tagName.c_str(), w->value.c_str(), static_cast<int>(w->position));
+                   w->tag ? TagName(w->tag) : Utf8(w->tagName.c_str(), "a warning").c_str(),
+                   Utf8(w->value.c_str(), "a warning").c_str(), static_cast<int>(w->position));
     }
   }
+  g_text = nullptr;
+  if (!text.Report().empty()) std::fprintf(stderr, "ofxkit dump: %s\n", text.Report().c_str());
   return rc;
 }
 

@@ -2,6 +2,7 @@
 #include <cstdio>
 #include <string>
 
+#include "charset.h"
 #include "cli.h"
 
 namespace cli {
@@ -82,21 +83,24 @@ int CmdStatement(int argc, char** argv) {
                  static_cast<int>(parsed.status));
   std::vector<const OEGenericStatementRs*> statements;
   CollectStatements(parsed.file.get(), statements);
+  Utf8Converter text(CharsetOf(*parsed.file));
   std::printf("%sdate,amount,type,fitid,name,memo,checknum\n", withAccount ? "account," : "");
   for (const OEGenericStatementRs* rs : statements) {
     const OEBankTransactionList* list = rs->GetBankTransactionList();
     if (!list) continue;
-    std::string account = withAccount ? Csv(AccountName(*rs).c_str()) + "," : "";
+    std::string account = withAccount ? Csv(text(AccountName(*rs).c_str(), "the account").c_str()) + "," : "";
     for (unsigned short i = 0; i < list->GetNumStatementTx(); ++i) {
       const OEBankStatementTx* tx = list->GetStatementTx(i);
       if (!tx) continue;
       const char* type = tx->ValidateTag(OE_TAG_TRNTYPE) ? OEDataConversion::Text(tx->GetTxType()) : "";
       std::printf("%s%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), IsoDate(*tx).c_str(), Amount(*tx).c_str(),
-                  Csv(type).c_str(), Csv(tx->GetFITId()).c_str(), Csv(tx->GetName()).c_str(),
-                  Csv(tx->GetMemo()).c_str(), Csv(tx->GetCheckNum()).c_str());
+                  Csv(type).c_str(), Csv(text(tx->GetFITId(), "FITID").c_str()).c_str(),
+                  Csv(text(tx->GetName(), "NAME").c_str()).c_str(), Csv(text(tx->GetMemo(), "MEMO").c_str()).c_str(),
+                  Csv(text(tx->GetCheckNum(), "CHEQUENUM").c_str()).c_str());
     }
   }
   if (statements.empty()) std::fprintf(stderr, "ofxkit statement: no bank or card statement in %s\n", files[0].c_str());
+  if (!text.Report().empty()) std::fprintf(stderr, "ofxkit statement: %s\n", text.Report().c_str());
   return rc;
 }
 
