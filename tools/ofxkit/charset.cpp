@@ -74,9 +74,14 @@ std::string CharsetOf(const OEFileOFX& file) {
 }
 
 Utf8Converter::Utf8Converter(const std::string& charset)
-    : m_charset(charset), m_cd(nullptr), m_known(true), m_utf8(charset == "UTF-8") {
-  if (m_utf8) return;
-  iconv_t cd = iconv_open("UTF-8", charset.c_str());
+    : m_charset(charset), m_cd(nullptr), m_known(true), m_utf8(charset == "UTF-8") {}
+
+// Opened at the first byte that is not ASCII: iconv loads the character
+// set's module, which a file of plain ASCII never needs.
+void Utf8Converter::Open() {
+  if (m_opened || m_utf8) return;
+  m_opened = true;
+  iconv_t cd = iconv_open("UTF-8", m_charset.c_str());
   if (cd == reinterpret_cast<iconv_t>(-1)) {
     m_known = false;
     cd = iconv_open("UTF-8", "US-ASCII");
@@ -95,6 +100,7 @@ size_t Utf8Converter::Convert(const char* text, size_t n, std::string& out) {
   while (ascii < n && p[ascii] < 0x80) ++ascii;
   out.append(text, ascii);  // the common case: plain ASCII converts to itself
   if (ascii == n) return 0;
+  Open();
   size_t bad = 0;
   if (m_utf8 || !m_cd) {
     // UTF-8 stands as it is, once checked; without iconv only ASCII passes.

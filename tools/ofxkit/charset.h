@@ -28,8 +28,9 @@ class Utf8Converter {
   Utf8Converter(const Utf8Converter&) = delete;
   Utf8Converter& operator=(const Utf8Converter&) = delete;
 
-  // False when iconv does not know the character set; text is then read as
-  // US-ASCII, every other byte counted.
+  // False when iconv does not know the character set (known once text that
+  // is not ASCII came); text is then read as US-ASCII, every other byte
+  // counted.
   bool Known() const { return m_known; }
   const std::string& Charset() const { return m_charset; }
 
@@ -49,8 +50,11 @@ class Utf8Converter {
   std::string Report() const;
 
  private:
+  void Open();
+
   std::string m_charset;
   void* m_cd;  // iconv_t
+  bool m_opened = false;
   bool m_known;
   bool m_utf8;
   size_t m_unconverted = 0;
