@@ -72,6 +72,22 @@ check "missing file: status 3" 3 "$?"
 check "missing file: one line" "1 1" "$(wc -l < "$work/missing.err") $(grep -c 'missing.ofx: No such file' "$work/missing.err")"
 check "missing file: ends with a line end" "0a" "$(tail -c 1 "$work/missing.err" | od -An -tx1 | tr -d ' ')"
 
+# exchange's progress when standard error is not a terminal: whole lines,
+# one per direction, no carriage returns running them together.
+echo "pa55word" | $ofxkit request statement --org "Demo Bank" --fid 1234 --user alice --password-stdin \
+  --bank-id 121000248 --account 1001 -o "$work/rq.ofx" 2> /dev/null
+$ofxkit serve --max-requests 1 --max-seconds 30 --transactions 2000 --ready-file "$work/ready" \
+  > /dev/null 2>&1 &
+server=$!
+for _ in $(seq 100); do [ -s "$work/ready" ] && break; sleep 0.1; done
+$ofxkit exchange "$work/rq.ofx" "$(cat "$work/ready")" -o "$work/reply.ofx" > /dev/null 2> "$work/progress"
+check "exchange over HTTP" 0 "$?"
+wait "$server"
+check "progress: no carriage return" 0 "$(tr -cd '\r' < "$work/progress" | wc -c)"
+check "progress: a whole line sent, a whole line received" "sent received" \
+  "$(awk '{print $1}' "$work/progress" | tr '\n' ' ' | sed 's/ $//')"
+check "progress: ends with a line end" "0a" "$(tail -c 1 "$work/progress" | od -An -tx1 | tr -d ' ')"
+
 if [ -n "$gen" ] && [ -f "$gen" ]; then
   # Over 11 MB: read completely (65,000 transactions, CR LF line ends).
   python3 "$gen" 65000 --crlf > "$work/big.ofx"
