@@ -1,4 +1,6 @@
 // ofxkit: reads, writes and exchanges OFX files from the command line.
+#include <unistd.h>
+
 #include <cstdio>
 #include <cstring>
 
@@ -34,6 +36,10 @@ void Usage(FILE* out) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  // Into a file or a pipe, output goes in 64 KB writes rather than 4 KB ones
+  // (a large statement's dump is megabytes); a terminal keeps its lines.
+  static char outputBuffer[1 << 16];
+  if (!isatty(STDOUT_FILENO)) std::setvbuf(stdout, outputBuffer, _IOFBF, sizeof outputBuffer);
   if (argc < 2 || !std::strcmp(argv[1], "--help") || !std::strcmp(argv[1], "-h") || !std::strcmp(argv[1], "help")) {
     Usage(argc < 2 ? stderr : stdout);
     return argc < 2 ? cli::kUsage : cli::kClean;
