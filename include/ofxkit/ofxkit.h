@@ -27,9 +27,18 @@
 #include "ofxkit/messages/bank/OEStopCheckProfile.h"
 #include "ofxkit/messages/bank/OEBankMessageSet.h"
 #include "ofxkit/messages/billpay/OEPayee.h"
+#include "ofxkit/messages/invest/OESecurities.h"
+#include "ofxkit/messages/invest/OEInvTransactions.h"
+#include "ofxkit/messages/invest/OEInvPositions.h"
+#include "ofxkit/messages/invest/OEInvLists.h"
+#include "ofxkit/messages/invest/OEInvStatement.h"
 #include "ofxkit/messages/mail/OEEMailProfile.h"
 #include "ofxkit/messages/profile/OEMessageSetCore.h"
 #include "ofxkit/messages/profile/OEMessageSetVersion.h"
+#include "ofxkit/messages/profile/OEProfile.h"
+#include "ofxkit/messages/signup/OESignUp.h"
+#include "ofxkit/messages/billpay/OEBillPayMessageSet.h"
+#include "ofxkit/messages/xfer/OEXferMessageSets.h"
 #include "ofxkit/messages/xfer/OEXferProfile.h"
 
 #include "ofxkit/parse/OEParseLogger.h"
@@ -40,6 +49,8 @@
 #include "ofxkit/envelope/OETransBase.h"
 #include "ofxkit/envelope/OERequest.h"
 #include "ofxkit/envelope/OEFile.h"
+
+#include "ofxkit/audit/Audit.h"
 
 #include "ofxkit/net/OENet.h"
 #include "ofxkit/net/NCGateway.h"

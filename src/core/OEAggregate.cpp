@@ -80,6 +80,11 @@ OEAggregateInfo& OEAggregateInfo::OneOf(OETagID first, OETagID second) {
   return *this;
 }
 
+OEAggregateInfo& OEAggregateInfo::ExactlyOneOf(std::initializer_list<OETagID> tags) {
+  exactlyOne.emplace_back(tags);
+  return *this;
+}
+
 const OEFieldDesc* OEAggregateInfo::FindField(OETagID tag) const {
   for (const OEAggregateInfo* info = this; info; info = info->parent)
     for (const OEFieldDesc& d : info->fields)
@@ -185,6 +190,7 @@ OEParseStatus OEAggregate::HandleTagStart(const OETagDictionaryEntry* const entr
     }
     return OE_PARSE_NO_PARSER;
   }
+  if (d->link) d->link(child, this, GetType());
   return PushAndSetObject(child, entry->id);
 }
 
@@ -213,9 +219,18 @@ OEBuildStatus OEAggregate::Build(OEBuilder* builder) const {
 
 unsigned short OEAggregate::AllRequiredPresent() {
   if (!OEDataObj::AllRequiredPresent()) return 0;
-  for (const OEAggregateInfo::Pair& pair : GetInfo().oneOf)
+  const OEAggregateInfo& info = GetInfo();
+  for (const OEAggregateInfo::Pair& pair : info.oneOf)
     if (ValidateTag(pair.first) && ValidateTag(pair.second)) return 0;
+  for (const std::vector<OETagID>& choice : info.exactlyOne)
+    if (PresentAmong(choice) != 1) return 0;
   return 1;
+}
+
+unsigned short OEAggregate::PresentAmong(const std::vector<OETagID>& tags) const {
+  unsigned short n = 0;
+  for (OETagID tag : tags) n = static_cast<unsigned short>(n + (ValidateTag(tag) ? 1 : 0));
+  return n;
 }
 
 // The missing tags are the absent required tags in order, then, for each
@@ -236,6 +251,11 @@ OETagID OEAggregate::GetFirstMissingRequiredTag(OETagID after) const {
     if (ValidateTag(pair.first) || ValidateTag(pair.second)) continue;
     if (passed) return pair.first;
     if (pair.first == after) passed = true;
+  }
+  for (const std::vector<OETagID>& choice : GetInfo().exactlyOne) {
+    if (choice.empty() || PresentAmong(choice) != 0) continue;
+    if (passed) return choice.front();
+    if (choice.front() == after) passed = true;
   }
   return OE_TAG_NONE;
 }
@@ -283,6 +303,8 @@ unsigned short OEAggregate::CopyAggregateFrom(const OEAggregate* source) {
         result = 0;
         continue;
       }
+      // Linked before its own copy, so that its children link through it.
+      if (d->link) d->link(copy, this, source->GetType());
       if (!copy->CopyAggregateFrom(from) || !d->put(this, copy)) {
         delete copy;
         result = 0;
@@ -291,6 +313,17 @@ unsigned short OEAggregate::CopyAggregateFrom(const OEAggregate* source) {
   }
   CopyBaseMembersFrom(source);
   return result;
+}
+
+void OEOwnedAggregate::LinkToMaker(OEAggregate* maker, OETagID makerType) {
+  const OEOwnedAggregate* inner = dynamic_cast<const OEOwnedAggregate*>(maker);
+  if (inner && inner->m_owner) {
+    m_owner = inner->m_owner;
+    m_ownerTag = inner->m_ownerTag;
+  } else {
+    m_owner = maker;
+    m_ownerTag = makerType;
+  }
 }
 
 void OEAggregate::LogFieldFault(OEParseWarning warning, OETagID tag, const OEString& text) {

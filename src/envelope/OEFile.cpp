@@ -157,9 +157,36 @@ void OEFile::ClearHeaders() {
   for (OEString& slot : m_headers) slot.Assign(nullptr, 0);
 }
 
+namespace {
+std::string FoldedName(const char* name) {
+  std::string key(name);
+  for (char& c : key)
+    if (c >= 'a' && c <= 'z') c = static_cast<char>(c - 'a' + 'A');
+  return key;
+}
+}  // namespace
+
 const OEMIMEHeader* OEFile::GetMIMEHeader(const char* name) const {
   if (!name) return nullptr;
-  for (unsigned short i = 0; i < m_mimeHeaders.Entries(); ++i) {
+  const unsigned short n = m_mimeHeaders.Entries();
+  try {
+    if (m_mimeIndexed > n) {  // headers were removed: index them anew
+      m_mimeIndex.clear();
+      m_mimeIndexed = 0;
+    }
+    for (; m_mimeIndexed < n; ++m_mimeIndexed)
+      if (const OEMIMEHeader* header = m_mimeHeaders.Get(m_mimeIndexed))
+        m_mimeIndex.emplace(FoldedName(header->GetName().c_str()), m_mimeIndexed);  // the first of a name wins
+    const auto found = m_mimeIndex.find(FoldedName(name));
+    if (found == m_mimeIndex.end()) return nullptr;
+    const OEMIMEHeader* header = m_mimeHeaders.Get(found->second);
+    if (header && header->GetName().strcmpi(name)) return header;
+  } catch (const std::bad_alloc&) {
+    m_mimeIndex.clear();
+    m_mimeIndexed = 0;
+  }
+  // Out of memory, or headers replaced behind the index: look at each.
+  for (unsigned short i = 0; i < n; ++i) {
     const OEMIMEHeader* header = m_mimeHeaders.Get(i);
     if (header && header->GetName().strcmpi(name)) return header;
   }
@@ -270,6 +297,8 @@ unsigned short OEFile::DeepCopyFrom(const OEFile* from) {
   m_mimeBody = from->m_mimeBody;
 
   m_mimeHeaders.DeleteAll();
+  m_mimeIndex.clear();
+  m_mimeIndexed = 0;
   for (unsigned short i = 0; i < from->m_mimeHeaders.Entries(); ++i) {
     const OEMIMEHeader* header = from->m_mimeHeaders.Get(i);
     if (header && !SetMIMEHeader(header->GetName(), header->GetValue())) return 0;
@@ -330,7 +359,11 @@ OEBuildStatus OEFileOFX::BuildHeaders(OEBuilder* builder) const {
   return builder->AddBlankLine();
 }
 
-unsigned short OEFileOFX::ValidateHeaders() const {
+unsigned short OEFileOFX::ValidateHeaders() const { return CheckHeaders(false); }
+
+unsigned short OEFileOFX::ValidateHeadersTolerantly() const { return CheckHeaders(true); }
+
+unsigned short OEFileOFX::CheckHeaders(bool tolerant) const {
   unsigned short result = 1;
   OEDataObj* self = const_cast<OEFileOFX*>(this);
   for (int t = OE_HEADER_OFXHEADER; t <= OE_HEADER_NEWFILEUID; ++t) {
@@ -343,7 +376,9 @@ unsigned short OEFileOFX::ValidateHeaders() const {
     }
     if (rule.check == kUnchecked || Accepted(rule, *value)) continue;
     OELogWarning(OEPW_BADFORMAT, *value, OEString(OEDataConversion::Text(tag)), GetType(), self);
-    if (rule.check == kFatal) result = 0;
+    const bool tolerated = tolerant && tag == OE_HEADER_ENCODING &&
+                           (value->strcmpi("UTF-8") || value->strcmpi("UTF8") || value->strcmpi("UNICODE"));
+    if (rule.check == kFatal && !tolerated) result = 0;
   }
   return result;
 }

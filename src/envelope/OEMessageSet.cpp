@@ -5,19 +5,6 @@
 #include <type_traits>
 
 
-unsigned short OESecListPlaceholder::GetArrayOfValidTags(OEArrayOfTags& tags) const {
-  static const OETagID kNone[1] = {OE_TAG_NONE};
-  tags.tags = kNone;
-  tags.count = 0;
-  return 1;
-}
-
-OESecListPlaceholder* OEChildCreator<OESecListPlaceholder>::Make(OEDataObjFactory*, OETagID) {
-  OESecListPlaceholder* list = new (std::nothrow) OESecListPlaceholder;
-  if (!list) g_allocFailed = 1;
-  return list;
-}
-
 namespace {
 enum Side { kRq = 0, kRs = 1 };
 

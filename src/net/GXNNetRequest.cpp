@@ -2,6 +2,7 @@
 // settings), waits for it on the application's thread, judges the server's
 // certificate when the gateway asks, and reads the reply and its headers
 // from the temporary files the gateway wrote.
+#include <curl/curl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -16,18 +17,46 @@ namespace {
 
 constexpr uint32_t kWaitSliceMs = 50;
 
-// The url as it may be logged: a password in its user part is hidden.
+// The url as it may be logged: read the way libcurl reads it, with a
+// password in its user part, its query and its fragment hidden. An address
+// that libcurl cannot read is not shown at all: where its parts end is
+// anybody's guess.
 std::string LoggableURL(const char* url) {
-  std::string text = url ? url : "";
-  size_t scheme = text.find("://");
-  if (scheme == std::string::npos) return text;
-  size_t hostStart = scheme + 3;
-  size_t hostEnd = text.find_first_of("/?#", hostStart);
-  size_t at = text.rfind('@', hostEnd == std::string::npos ? text.size() : hostEnd);
-  if (at == std::string::npos || at < hostStart) return text;
-  size_t colon = text.find(':', hostStart);
-  if (colon == std::string::npos || colon > at) return text;
-  return text.substr(0, colon + 1) + "(hidden)" + text.substr(at);
+  if (!url) return std::string();
+  if (OENetRequest::HasFileScheme(url)) return url;
+  std::string shown = "(malformed address)";
+  CURLU* u = curl_url();
+  char* text = nullptr;
+  if (u && curl_url_set(u, CURLUPART_URL, url, CURLU_NON_SUPPORT_SCHEME) == CURLUE_OK) {
+    bool ok = true;
+    const CURLUPart hidden[] = {CURLUPART_PASSWORD, CURLUPART_QUERY, CURLUPART_FRAGMENT};
+    for (CURLUPart part : hidden) {
+      char* value = nullptr;
+      if (curl_url_get(u, part, &value, 0) == CURLUE_OK && value)
+        ok = ok && curl_url_set(u, part, "(hidden)", 0) == CURLUE_OK;
+      curl_free(value);
+    }
+    if (ok && curl_url_get(u, CURLUPART_URL, &text, 0) == CURLUE_OK && text) shown = text;
+  }
+  curl_free(text);
+  curl_url_cleanup(u);
+  return shown;
+}
+
+// Why the gateway refused a certificate, for the log.
+const char* CertificateErrorText(unsigned short error) {
+  switch (error) {
+    case GX_ERR_CERT_UNTRUSTED:
+      return "the server's certificate chain does not verify up to a trusted root";
+    case GX_ERR_CERT_EXPIRED:
+      return "a certificate of the server's chain is expired or not yet valid";
+    case GX_ERR_CERT_NAME:
+      return "the server's certificate does not name the host";
+    case GX_ERR_CERT_WEAK:
+      return "a key or signature digest of the server's chain is too weak (RSA keys under 2048 bits, MD5, SHA-1)";
+    default:
+      return nullptr;
+  }
 }
 
 const char* RootLabel(unsigned long rootID) {
@@ -396,6 +425,7 @@ unsigned short GXNNetRequest::CheckCertificate(SSLCertificateChain* chain, unsig
                                                unsigned short error) {
   if (error) {
     Log(1, "***GXN: SSL certificate error: %d", error);
+    if (const char* why = CertificateErrorText(error)) Log(1, "***GXN: %s", why);
     return error;
   }
   if (rootID == OE_ROOT_VERISIGN_CLASS3) {

@@ -553,6 +553,23 @@ unsigned short OEParseEngine::GetHeader(OEHeaderTag& tag, OEString& value, OEStr
   }
 }
 
+uint32_t OEParseEngine::SkipBlankLines() {
+  Refresh();
+  const Scanner s = Scan();
+  const int32_t blankEnd = s.SkipWs(m_headerPos);
+  uint32_t lines = 0;
+  int32_t lastLineEnd = -1;
+  for (int32_t i = m_headerPos; i >= 0 && i < blankEnd; ++i) {
+    const char c = s.At(i);
+    if (c == '\n' || (c == '\r' && s.At(i + 1) != '\n')) {
+      ++lines;
+      lastLineEnd = i;
+    }
+  }
+  if (lastLineEnd >= 0) m_headerPos = lastLineEnd + 1;
+  return lines;
+}
+
 OEMIMEType OEParseEngine::GetFileType(OEString* contentType) {
   Refresh();
   if (!contentType || !ContainsIgnoringCase(contentType->c_str(), contentType->GetStrLength(), "x-ofx"))

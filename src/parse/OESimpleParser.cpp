@@ -1,8 +1,10 @@
 #include "ofxkit/parse/OESimpleParser.h"
 
+#include <cstdio>
 #include <cstring>
 #include <new>
 
+#include "ofxkit/core/OEAggregate.h"
 #include "ofxkit/core/OEDataObj.h"
 #include "ofxkit/core/OEDataObjFactory.h"
 #include "ofxkit/core/OETagDictionary.h"
@@ -21,6 +23,23 @@ void MaskPassword(OEString& value) {
   memset(text, '*', n);
   text[n] = '\0';
   value.UnlockBuffer();
+}
+// The elements whose values are passwords: never shown, in a warning or in
+// the parser's copy.
+bool IsPasswordTag(OETagID tag) {
+  return tag == OE_TAG_USERPASS || tag == OE_TAG_NEWUSERPASS || tag == OE_TAG_TEMPPASS;
+}
+// Masks the texts of the warnings logged from `first` on that name no known
+// tag: after a password element they are pieces of a malformed password
+// (`<USERPASS>Secr3t<Rest0fPass`), read as unknown tags or stray text.
+void MaskWarningsSince(uint32_t first) {
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  for (uint32_t i = first; log && i < log->Entries(); ++i) {
+    OEParseException* record = log->Get(static_cast<unsigned short>(i));
+    if (!record || record->tag != OE_TAG_NONE) continue;
+    MaskPassword(record->value);
+    MaskPassword(record->tagName);
+  }
 }
 // True when, after blanks, the text at `position` is the start tag <OFX>.
 bool AnotherOFXFollows(OEBuffer& buffer, int32_t position) {
@@ -60,20 +79,47 @@ OEParseStatus OESimpleParser::ReadHeaders(OEParseEngine& engine, OEDataObj* root
   OEString name;
   // First block: MIME or HTTP-style lines (with their names), then the OFX
   // header lines. A text that starts with the OFX headers reads them here.
-  while (engine.GetHeader(tag, value, &name)) {
-    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, &name);
-    if (status != OE_PARSE_OK) return status;
-  }
-  while (engine.GetHeader(tag, value, nullptr)) {
-    OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, nullptr);
-    if (status != OE_PARSE_OK) return status;
+  // Real header blocks hold a few dozen lines; past kMaxHeaderLines the lines
+  // are still read (so the body is found where it starts) but not kept.
+  uint32_t lines = 0;
+  if ((m_options & OE_READ_TOLERANT) && engine.SkipBlankLines())
+    LogRecord(OEPW_BADFORMAT, OEString("blank lines before the header block"), "", OE_TAG_NONE);
+  for (int block = 0; block < 2; ++block) {
+    OEString* names = block == 0 ? &name : nullptr;
+    while (engine.GetHeader(tag, value, names)) {
+      if (++lines > kMaxHeaderLines) {
+        if (lines == kMaxHeaderLines + 1) {
+          char text[64];
+          snprintf(text, sizeof text, "more than %u header lines: the rest were not read",
+                   static_cast<unsigned>(kMaxHeaderLines));
+          LogRecord(OEPW_BADFORMAT, OEString(text), names ? name.c_str() : "", OE_TAG_NONE);
+        }
+        continue;
+      }
+      OEParseStatus status = GetCurrentObj()->HandleHeader(tag, value, names);
+      if (status != OE_PARSE_OK) return status;
+    }
   }
   OETagID type = root->GetType();
   if (type == OE_TAG_OFXFILERS || type == OE_TAG_OFXFILERQ) {
     const OEHeaderValidation* file = dynamic_cast<const OEHeaderValidation*>(root);
-    if (file && !file->ValidateHeaders()) return OE_PARSE_NOT_HANDLED;
+    if (file && !((m_options & OE_READ_TOLERANT) ? file->ValidateHeadersTolerantly() : file->ValidateHeaders()))
+      return OE_PARSE_NOT_HANDLED;
   }
   return OE_PARSE_OK;
+}
+
+// A tolerant reading takes an element of the current aggregate that is
+// directly followed by another tag ("<MEMO><NAME>") as an empty element:
+// nothing is set, and a warning names it. False when the tag is no element
+// of the current object (it then goes to HandleTagStart as usual).
+bool OESimpleParser::ReadEmptyElement(const OETagDictionaryEntry& entry) {
+  if (!(m_options & OE_READ_TOLERANT)) return false;
+  const OEAggregate* aggregate = dynamic_cast<const OEAggregate*>(GetCurrentObj());
+  const OEFieldDesc* field = aggregate ? aggregate->FieldAt(entry.id) : nullptr;
+  if (!field || (field->kind != OE_FIELD_ELEMENT && field->kind != OE_FIELD_VALUES)) return false;
+  LogRecord(OEPW_BADFORMAT, OEString(), entry.name, entry.id);
+  return true;
 }
 
 OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) {
@@ -82,9 +128,15 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
   OEParseStatus status = OE_PARSE_OK;
   int32_t previous = -1;
   OETagID previousElement = OE_TAG_NONE;
+  OEParseLogger* log = OEParseLogger::TheOEParseLogger();
+  bool afterPassword = false;
   while (status == OE_PARSE_OK && previous != OE_TAG_DONE) {
     bool afterElement = previous == OE_TAG_ELEMENT;
+    const uint32_t logged = log ? log->Entries() : 0;
     OETagType kind = engine.GetOETag(entry, value);
+    // Whatever lies between a password tag and the next known tag is secret.
+    if (afterPassword) MaskWarningsSince(logged);
+    afterPassword = (kind == OE_TAG_ELEMENT || kind == OE_TAG_START) && IsPasswordTag(entry.id);
     previous = kind;
     // Warnings take their position from the buffer's offset: keep it just
     // past the item being handled.
@@ -92,6 +144,11 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
     OEDataObj* current = GetCurrentObj();
     switch (kind) {
       case OE_TAG_START:
+        if (IsValidTag(entry.id) && ReadEmptyElement(entry)) {
+          previous = OE_TAG_ELEMENT;  // so that its end tag, when given, is passed over
+          previousElement = entry.id;
+          break;
+        }
         if (!IsValidTag(entry.id)) {
           LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
           engine.SkipCurrentTag();
@@ -110,7 +167,7 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
           previous = OE_TAG_DONE;
         break;
       case OE_TAG_ELEMENT: {
-        bool password = entry.id == OE_TAG_USERPASS;
+        bool password = IsPasswordTag(entry.id);
         if (!IsValidTag(entry.id)) {
           if (password) MaskPassword(value);
           if (!LogRecord(OEPW_INVALIDELEM, value, entry.name, entry.id)) status = OE_PARSE_NO_PARSER;

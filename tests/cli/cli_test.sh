@@ -114,8 +114,47 @@ check "ready file removed" no "$([ -e "$work/url2" ] && echo yes || echo no)"
 check "query strings not logged" "POST /ofx?... 400" "$(grep -o '^POST /ofx?\.\.\. 400' "$work/serve2.log")"
 check "no password in the request log" 0 "$(grep -c pa55word "$work/serve2.log")"
 $ofxkit serve --port 70000 > /dev/null 2>&1; check "bad port" 64 $?
-$ofxkit serve --transactions 60001 > /dev/null 2>&1; check "too many transactions" 64 $?
+$ofxkit serve --transactions 25001 > /dev/null 2>&1; check "too many transactions" 64 $?
 $ofxkit serve --user alice --password-stdin < /dev/null > /dev/null 2>&1; check "no password given" 64 $?
+
+# Hostile and modern files: no crash, no silent loss, tolerant by default.
+$ofxkit respond --transactions 25000 "$work/rq.ofx" -o "$work/max.ofx"
+check "the largest --transactions is answered" "0 25000" "$? $(grep -c '<STMTTRN>' "$work/max.ofx")"
+python3 - "$work/rq.ofx" "$work/many.ofx" <<'PY'
+import sys
+s = open(sys.argv[1]).read()
+a = s.index('<STMTTRNRQ>'); b = s.index('</STMTTRNRQ>') + len('</STMTTRNRQ>')
+open(sys.argv[2], 'w').write(s[:a] + s[a:b] * 2000 + s[b:])
+PY
+$ofxkit respond "$work/many.ofx" -o "$work/many-rs.ofx"
+check "2000 statement requests: 64 answered, the rest refused" "0 64 936" \
+  "$? $(grep -c '<STMTRS>' "$work/many-rs.ofx") $(grep -c '<CODE>2000' "$work/many-rs.ofx")"
+sed 's/^CHARSET:.*/CHARSET:\xff/' "$work/rs.ofx" > "$work/charset.ofx"
+$ofxkit dump --json "$work/charset.ofx" | python3 -c 'import json,sys; print(json.load(sys.stdin)["tree"]["headers"]["CHARSET"] == "\ufffd")' > "$work/cs"
+check "JSON dump of a non-UTF-8 header" "True" "$(cat "$work/cs")"
+sed 's/<OFX>/<OFX >/' "$work/rs.ofx" > "$work/space.ofx"
+$ofxkit statement "$work/space.ofx" > /dev/null; check "<OFX > is OFX" 0 $?
+sed '0,/<NAME>/s/<NAME>[^<]*/<NAME>=HYPERLINK("x")/' "$work/rs.ofx" > "$work/formula.ofx"
+check "formula made harmless" 1 "$($ofxkit statement "$work/formula.ofx" | grep -c "'=HYPERLINK")"
+check "unless --raw" 1 "$($ofxkit statement --raw "$work/formula.ofx" | grep -c ',"=HYPERLINK')"
+python3 - "$work/rs.ofx" "$work/lost.ofx" "$work/modern.ofx" <<'PY'
+import sys
+s = open(sys.argv[1], newline='').read()
+i = s.index('<STMTTRN>'); j = s.index('</STMTTRN>', s.index('</STMTTRN>', i) + 1) + len('</STMTTRN>')
+open(sys.argv[2], 'w', newline='').write(s[:i] + '<XTRA>' + s[i:j] + '<MEMO>x</XTRA>' + s[j:])
+m = s.replace('ENCODING:USASCII', 'ENCODING:UTF-8').replace('VERSION:102', 'VERSION:160')
+k = m.index('<NAME>'); m = m[:k] + '<MEMO>\n' + m[k:]
+open(sys.argv[3], 'w', newline='').write('\n' * 12 + m)
+PY
+$ofxkit statement "$work/lost.ofx" > "$work/lost.csv" 2> "$work/lost.err"
+check "swallowed transactions: exit 1" 1 $?
+check "and named" 1 "$(grep -c 'STMTTRN in the file were not read' "$work/lost.err")"
+$ofxkit check "$work/lost.ofx" > "$work/check.txt"
+check "check lists the loss" "1 1" "$? $(grep -c '^  LOSS missing: 2 of 4 STMTTRN' "$work/check.txt")"
+$ofxkit statement "$work/modern.ofx" > "$work/modern.csv" 2> /dev/null
+check "modern file read by default" "1 5" "$? $(wc -l < "$work/modern.csv")"
+$ofxkit statement --strict "$work/modern.ofx" > /dev/null 2>&1
+check "and refused with --strict" 2 $?
 
 echo "$((checks - failures)) passed, $failures failed"
 [ "$failures" -eq 0 ]

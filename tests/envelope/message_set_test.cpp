@@ -160,7 +160,7 @@ TEST_F(MessageSetTest, SecurityListSetsNeedTheirContent) {
   OEMessageSetRs rs;
   rs.SetType(OE_TAG_SECLISTMSGSRSV1);
   EXPECT_EQ(rs.AllRequiredPresent(), 0);
-  OESecListPlaceholder* list = new OESecListPlaceholder;
+  OESecList* list = new OESecList;
   EXPECT_EQ(rs.SetSecList(list), 1);
   EXPECT_EQ(rs.AllRequiredPresent(), 1);
   EXPECT_EQ(rs.GetNumberOfChildren(), 1);  // the list is not one of the set's child positions
@@ -246,18 +246,22 @@ TEST_F(MessageSetTest, FactoryIsSetOnlyWhenGiven) {
   EXPECT_EQ(OEDataObj::GetFactory(), current);
 }
 
-TEST_F(MessageSetTest, SecurityListIsHeldAndItsContentSkipped) {
+TEST_F(MessageSetTest, SecurityListIsReadAndWrittenAfterItsTransaction) {
   OEResponse response;
   std::string text = std::string("<OFX>") + kSignOnRs +
-                     "<SECLISTMSGSRSV1><SECLIST><STOCKINFO><SECINFO><SECNAME>Acme</SECINFO></STOCKINFO>"
-                     "</SECLIST></SECLISTMSGSRSV1></OFX>";
-  EXPECT_EQ(Parse(text, &response), OE_PARSE_WARNINGS);
-  EXPECT_EQ(Count(OEPW_INVALIDAGG), 1);
+                     "<SECLISTMSGSRSV1><SECLIST><STOCKINFO><SECINFO><SECID><UNIQUEID>123<UNIQUEIDTYPE>CUSIP</SECID>"
+                     "<SECNAME>Acme</SECINFO></STOCKINFO></SECLIST>"
+                     "<SECLISTTRNRS><TRNUID>9<STATUS><CODE>0<SEVERITY>INFO</STATUS><SECLISTRS></SECLISTRS>"
+                     "</SECLISTTRNRS></SECLISTMSGSRSV1></OFX>";
+  EXPECT_EQ(Parse(text, &response), OE_PARSE_OK);
   ASSERT_EQ(response.GetNumMessage(), 2);
   OEMessageSetRs* set = response.GetMessageSet(1);
   ASSERT_NE(set->GetSecList(), nullptr);
-  EXPECT_EQ(set->GetSecList()->GetType(), OE_TAG_SECLIST);
+  ASSERT_EQ(set->GetSecList()->GetNumStockInfo(), 1);
+  EXPECT_EQ(set->GetSecList()->GetStockInfo(0)->GetSecInfo()->GetSecName(), "Acme");
   EXPECT_EQ(set->AllRequiredPresent(), 1);
+  const std::string written = Write(*set);
+  EXPECT_LT(written.find("</SECLISTTRNRS>"), written.find("<SECLIST>")) << written;
 }
 
 TEST_F(MessageSetTest, RequestRoundTripsThroughTheParser) {

@@ -60,11 +60,13 @@ class Loopback : public ::testing::Test {
   }
 
   // Starts a server answering with handler (or with an echo of the body).
-  void Serve(bool https, loopback::Handler handler = nullptr, const char* host = "127.0.0.1") {
+  void Serve(bool https, loopback::Handler handler = nullptr, const char* host = "127.0.0.1",
+             const loopback::Authority* with = nullptr, bool tls12Only = false) {
     loopback::ServerOptions options;
+    options.tls12Only = tls12Only;
     options.host = host;
     options.https = https;
-    options.authority = authority;
+    options.authority = with ? with : authority;
     options.maxSeconds = 30;
     options.maxRequests = 10;
     if (!handler) {
@@ -110,8 +112,8 @@ class Loopback : public ::testing::Test {
     EXPECT_EQ(request->LoadReply(&reply), OE_NET_OK);
     return std::string(reply.GetBufferPtr() ? reply.GetBufferPtr() : "", reply.GetBufferSize());
   }
-  unsigned short TrustAuthority(OECallbackRootID id) {
-    const std::string& der = authority->CaDER();
+  unsigned short TrustAuthority(OECallbackRootID id, const loopback::Authority* which = nullptr) {
+    const std::string& der = (which ? which : authority)->CaDER();
     return request->AddTrustedRootBER(der.data(), static_cast<unsigned short>(der.size()), id);
   }
   std::string ServerCertID() {
@@ -123,7 +125,19 @@ class Loopback : public ::testing::Test {
     return std::string(text->GetBufferPtr(), text->GetBufferSize());
   }
 
+  // Serves HTTPS with a certificate made as leaf asks, by a new authority
+  // that a fresh request trusts under root id 1.
+  void ServeCertificate(const loopback::LeafOptions& leaf, bool tls12Only = false) {
+    std::string error;
+    odd = loopback::Authority::Make("ofxkit tests", "odd root", &error, leaf);
+    ASSERT_NE(odd, nullptr) << error;
+    Serve(true, nullptr, "127.0.0.1", odd.get(), tls12Only);
+    request.reset(static_cast<GXNNetRequest*>(access.NewNetRequest()));
+    ASSERT_EQ(TrustAuthority(OE_ROOT_VEXA_BRANDING, odd.get()), 1);
+  }
+
   static loopback::Authority* authority;
+  std::unique_ptr<loopback::Authority> odd;
   std::string folder;
   GXNNetAccess access;
   std::unique_ptr<GXNNetRequest> request;
@@ -247,6 +261,116 @@ TEST_F(Loopback, HttpsExpectedIdentityAndRefusedRoots) {
   uint32_t http = 0, error = 0;
   request->GetStatus(http, error);
   EXPECT_EQ(error, 1671u);
+}
+
+TEST_F(Loopback, WeakCertificatesRefusedWithOrWithoutVerification) {
+  struct Case {
+    int bits;
+    const char* digest;
+  };
+  for (Case weak : {Case{1024, "SHA256"}, Case{2048, "SHA1"}, Case{2048, "MD5"}, Case{512, "SHA256"}}) {
+    SCOPED_TRACE(std::to_string(weak.bits) + " bits, " + weak.digest);
+    loopback::LeafOptions leaf;
+    leaf.keyBits = weak.bits;
+    leaf.digest = weak.digest;
+    // A 512-bit key cannot sign for TLS 1.3: offered over TLS 1.2.
+    ASSERT_NO_FATAL_FAILURE(ServeCertificate(leaf, weak.bits < 1024));
+    for (unsigned short verify : {1, 0}) {
+      request->SetSSLVerifyCert(verify);
+      g_lines.clear();
+      EXPECT_EQ(Send(URL()), OE_NET_OTHER_ERROR);
+      uint32_t http = 0, error = 0;
+      request->GetStatus(http, error);
+      EXPECT_EQ(error, 1674u);
+      EXPECT_TRUE(Logged("***GXN: SSL certificate error: 1674"));
+      EXPECT_FALSE(Logged("GXN: Received trusted root 1 (Vexari Branding CA)"));
+    }
+    server->Stop();
+  }
+  // A sound certificate made the same way is accepted.
+  ASSERT_NO_FATAL_FAILURE(ServeCertificate(loopback::LeafOptions()));
+  EXPECT_EQ(Send(URL()), OE_NET_OK);
+  Reply();
+}
+
+TEST_F(Loopback, ForgedCertificateGetsNoRootEvenWithoutVerification) {
+  // Signed by a stray key while naming the trusted authority as its issuer.
+  loopback::LeafOptions leaf;
+  leaf.forged = true;
+  ASSERT_NO_FATAL_FAILURE(ServeCertificate(leaf));
+  for (unsigned short verify : {1, 0}) {
+    request->SetSSLVerifyCert(verify);
+    g_lines.clear();
+    EXPECT_EQ(Send(URL()), OE_NET_CERT_REJECTED);
+    EXPECT_TRUE(Logged("***GXN: SSL certificate error: 1670"));
+    EXPECT_FALSE(Logged("GXN: Received trusted root 1 (Vexari Branding CA)"));
+  }
+}
+
+TEST_F(Loopback, WithoutVerificationOnlyDatesAndHostGoUnchecked) {
+  loopback::LeafOptions leaf;
+  leaf.validDays = 0;
+  leaf.altNames = "DNS:elsewhere.example";
+  ASSERT_NO_FATAL_FAILURE(ServeCertificate(leaf));
+  sleep(1);  // past its end
+  EXPECT_NE(Send(URL()), OE_NET_OK);
+  request->SetSSLVerifyCert(0);
+  g_lines.clear();
+  ASSERT_EQ(Send(URL()), OE_NET_OK);
+  EXPECT_TRUE(Logged("GXN: Received trusted root 1 (Vexari Branding CA)"));
+  Reply();
+}
+
+TEST_F(Loopback, HostNamesCheckedAsStrictlyAsCurlDoes) {
+  struct Case {
+    const char* commonName;
+    const char* altNames;
+    const char* host;
+    OENetStatus expected;
+  };
+  const Case cases[] = {
+      {"bank.example.localhost", "DNS:bank.example.localhost", "bank.example.localhost", OE_NET_OK},
+      {"x", "DNS:*.example.localhost", "bank.example.localhost", OE_NET_OK},
+      // A partial wildcard names nothing.
+      {"x", "DNS:b*.example.localhost", "bank.example.localhost", OE_NET_CERT_ERROR_1673},
+      // With alternative names the common name is never consulted.
+      {"localhost", "IP:127.0.0.1", "localhost", OE_NET_CERT_ERROR_1673},
+      {"localhost", "DNS:other.localhost", "localhost", OE_NET_CERT_ERROR_1673},
+      // Without any, it is.
+      {"localhost", "", "localhost", OE_NET_OK},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(std::string(c.altNames) + " for " + c.host);
+    loopback::LeafOptions leaf;
+    leaf.commonName = c.commonName;
+    leaf.altNames = c.altNames;
+    ASSERT_NO_FATAL_FAILURE(ServeCertificate(leaf));
+    std::string url = "https://" + std::string(c.host) + ":" + std::to_string(server->Port()) + "/ofx";
+    EXPECT_EQ(Send(url), c.expected);
+    if (c.expected == OE_NET_OK) Reply();
+    server->Stop();
+  }
+}
+
+TEST_F(Loopback, ReplyLargerThanABufferRefusedWhileArriving) {
+  Serve(false, [](const loopback::HttpRequest&) {
+    loopback::HttpResponse rs;
+    rs.body.assign(OEBuffer::kMaxBufferSize, 'x');
+    return rs;
+  });
+  EXPECT_EQ(Send(URL()), OE_NET_OTHER_ERROR);
+  uint32_t http = 0, error = 0;
+  request->GetStatus(http, error);
+  EXPECT_EQ(error, 1541u);
+  server->Stop();
+  // One byte less fits.
+  Serve(false, [](const loopback::HttpRequest&) {
+    loopback::HttpResponse rs;
+    rs.body.assign(OEBuffer::kMaxBufferSize - 1, 'x');
+    return rs;
+  });
+  ASSERT_EQ(Send(URL()), OE_NET_OK);
+  EXPECT_EQ(Reply().size(), OEBuffer::kMaxBufferSize - 1);
 }
 
 GXNNetRequest* g_request;

@@ -3,12 +3,14 @@
 #include <arpa/inet.h>
 #include <gtest/gtest.h>
 #include <netinet/in.h>
+#include <openssl/ssl.h>
 #include <poll.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
 #include <atomic>
 #include <chrono>
+#include <memory>
 #include <string>
 #include <thread>
 
@@ -41,6 +43,38 @@ std::string Exchange(int port, const std::string& bytes, bool closeEarly = false
 }
 
 std::string StatusLine(const std::string& reply) { return reply.substr(0, reply.find("\r\n")); }
+
+int Connect(int port) {
+  int fd = socket(AF_INET, SOCK_STREAM, 0);
+  sockaddr_in addr{};
+  addr.sin_family = AF_INET;
+  addr.sin_port = htons(static_cast<uint16_t>(port));
+  inet_pton(AF_INET, "127.0.0.1", &addr.sin_addr);
+  if (connect(fd, reinterpret_cast<sockaddr*>(&addr), sizeof addr) != 0) {
+    close(fd);
+    return -1;
+  }
+  return fd;
+}
+
+// Over TLS (the server's certificate unchecked): shakes hands, then either
+// hangs up at once or sends `bytes` and reads the answer.
+std::string ExchangeTLS(int port, const std::string& bytes, bool hangUpAfterHandshake) {
+  std::string reply;
+  SSL_CTX* ctx = SSL_CTX_new(TLS_client_method());
+  int fd = Connect(port);
+  SSL* ssl = ctx && fd >= 0 ? SSL_new(ctx) : nullptr;
+  if (ssl && SSL_set_fd(ssl, fd) == 1 && SSL_connect(ssl) == 1 && !hangUpAfterHandshake) {
+    SSL_write(ssl, bytes.data(), static_cast<int>(bytes.size()));
+    char buf[4096];
+    int n;
+    while ((n = SSL_read(ssl, buf, sizeof buf)) > 0) reply.append(buf, static_cast<size_t>(n));
+  }
+  if (ssl) SSL_free(ssl);
+  if (fd >= 0) close(fd);
+  if (ctx) SSL_CTX_free(ctx);
+  return reply;
+}
 
 TEST(LoopbackServer, AnswersBadRequestsAndKeepsServing) {
   std::atomic<int> handled{0};
@@ -110,6 +144,60 @@ TEST(LoopbackServer, BoundsEndTheServer) {
   hanging.Run();
   waiting.join();
   EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(4));
+}
+
+TEST(LoopbackServer, HttpsSurvivesClientsThatHangUp) {
+  std::string error;
+  std::unique_ptr<loopback::Authority> authority = loopback::Authority::Make("ofxkit tests", "root", &error);
+  ASSERT_NE(authority, nullptr) << error;
+  loopback::ServerOptions options;
+  options.https = true;
+  options.authority = authority.get();
+  options.maxSeconds = 30;
+  loopback::Server server(options, [](const loopback::HttpRequest&) {
+    loopback::HttpResponse rs;
+    rs.body = "still here";
+    return rs;
+  });
+  ASSERT_TRUE(server.Listen(&error)) << error;
+  server.Start();
+  // Writing to them (a session ticket, a close_notify) must not raise SIGPIPE.
+  for (int i = 0; i < 5; ++i) ExchangeTLS(server.Port(), "", true);
+  std::string reply = ExchangeTLS(server.Port(), "GET / HTTP/1.1\r\n\r\n", false);
+  EXPECT_EQ(StatusLine(reply), "HTTP/1.1 200 OK");
+  EXPECT_NE(reply.find("still here"), std::string::npos);
+  server.Stop();
+}
+
+TEST(LoopbackServer, TricklingClientLosesItsConnectionAtTheRequestDeadline) {
+  loopback::ServerOptions options;
+  options.maxSeconds = 30;
+  options.requestSeconds = 1;
+  loopback::Server server(options, [](const loopback::HttpRequest&) { return loopback::HttpResponse(); });
+  std::string error;
+  ASSERT_TRUE(server.Listen(&error)) << error;
+  server.Start();
+  using Clock = std::chrono::steady_clock;
+  auto start = Clock::now();
+  int fd = Connect(server.Port());
+  ASSERT_GE(fd, 0);
+  // One byte every 200 ms never idles long enough to be dropped for idling.
+  bool dropped = false;
+  const std::string trickle = "POST / HTTP/1.1\r\nContent-Length: 100\r\nX-Padding: aaaaaaaaaaaaaaaaaaaaaaaaaaaaaaaaaaaa";
+  for (size_t i = 0; i < trickle.size() && !dropped; ++i) {
+    if (send(fd, &trickle[i], 1, MSG_NOSIGNAL) != 1) dropped = true;
+    pollfd p{fd, POLLIN, 0};
+    if (poll(&p, 1, 200) > 0) {
+      char c;
+      if (recv(fd, &c, 1, 0) <= 0) dropped = true;
+    }
+  }
+  close(fd);
+  EXPECT_TRUE(dropped);
+  EXPECT_LT(Clock::now() - start, std::chrono::seconds(3));
+  // The next client is served.
+  EXPECT_EQ(StatusLine(Exchange(server.Port(), "GET / HTTP/1.1\r\n\r\n")), "HTTP/1.1 200 OK");
+  server.Stop();
 }
 
 TEST(LoopbackServer, RefusesWhatItCannotServe) {

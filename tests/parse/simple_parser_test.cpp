@@ -173,6 +173,37 @@ TEST_F(SimpleParserTest, PasswordsNeverReachTheLog) {
     EXPECT_EQ(std::string(Log()->Get(i)->value.c_str()).find("ppp"), std::string::npos);
 }
 
+TEST_F(SimpleParserTest, EveryPasswordElementAndWhatTrailsAMalformedOneStaysHidden) {
+  // New and temporary passwords in the wrong place are masked like USERPASS.
+  Parsed p = Parse("<OFX><SIGNONMSGSRSV1><NEWUSERPASS>n3wSecret<TEMPPASS>t3mpSecret</SIGNONMSGSRSV1></OFX>");
+  ASSERT_EQ(Log()->Entries(), 2);
+  EXPECT_EQ(Log()->Get(0)->value, "*********");
+  EXPECT_EQ(Log()->Get(1)->value, "**********");
+  // A password cut short by a '<': what follows it up to the next known tag
+  // is the rest of the password, not a tag name to show.
+  for (const char* text : {"<OFX><USERPASS>Secr3t<Rest0fPass\n<MEMO>kept</OFX>",
+                           "<OFX><USERPASS>Secr3t<Rest0fPass><MEMO>kept</OFX>",
+                           "<OFX><USERPASS>Secr3t<Rest0f Pass>more<MEMO>kept</OFX>",
+                           "<OFX><USERPASS><Rest0fPass><MEMO>kept</OFX>"}) {
+    SCOPED_TRACE(text);
+    p = Parse(text);
+    EXPECT_GT(Log()->Entries(), 0);
+    for (unsigned short i = 0; i < Log()->Entries(); ++i) {
+      const OEParseException* record = Log()->Get(i);
+      for (const char* secret : {"Secr3t", "Rest0f", "Pass", "more"}) {
+        EXPECT_EQ(std::string(record->value.c_str()).find(secret), std::string::npos) << record->value.c_str();
+        EXPECT_EQ(std::string(record->tagName.c_str()).find(secret), std::string::npos) << record->tagName.c_str();
+      }
+    }
+  }
+  // What follows the next known tag is shown again.
+  p = Parse("<OFX><USERPASS>Secr3t<Rest0fPass><MEMO>kept<Unknown1>x</Unknown1></OFX>");
+  bool shown = false;
+  for (unsigned short i = 0; i < Log()->Entries(); ++i)
+    shown = shown || std::string(Log()->Get(i)->tagName.c_str()).find("Unknown1") != std::string::npos;
+  EXPECT_TRUE(shown);
+}
+
 TEST_F(SimpleParserTest, TruncatedAndTrailingText) {
   Parsed p = Parse("<OFX><SIGNONMSGSRSV1>");
   EXPECT_EQ(p.status, OE_PARSE_NOT_HANDLED);

@@ -38,21 +38,44 @@ class Args {
 
 // A parsed OFX file: a request or a response file, whichever it is.
 struct ParsedFile {
+  // Set before the parse: the library's recovery rules only, without the
+  // tolerant reading (OE_READ_TOLERANT) that the tool uses by default.
+  bool strict = false;
   std::unique_ptr<OEFileOFX> file;
   bool isResponse = false;
   OEParseStatus status = OE_PARSE_OK;
   OEDataObj* objectWithError = nullptr;
+  // What the text holds that the tree does not (read once more after the parse).
+  ofxkit::AuditReport audit;
 };
 
 // Reads a whole file; false with a message when it cannot.
 bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error);
+// Writes a file, or standard output for "-". A private file (one holding a
+// password or account data) goes through WritePrivateFile.
 bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile = false);
+// Writes buffer to path so that nobody else can read it there at any moment:
+// into a new file of mode 0600 beside path, renamed over it once complete. A
+// symbolic link at path is refused, not followed; a device or pipe
+// (/dev/null) is written into as it is.
+bool WritePrivateFile(const std::string& path, const OEBuffer& buffer, std::string* error);
+// No core dump of this process from now on (it holds a password).
+void KeepSecretsOutOfCoreDumps();
 // Parses an OFX file (request or response, told from its message sets).
 // Returns kBadInput with a message for what is not OFX at all.
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error);
 // The same for a file already in memory; name is used in messages.
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error);
 int ExitForStatus(OEParseStatus status);
+// Prints one line per loss the audit found ("ofxkit COMMAND: 3 of 6 STMTTRN in
+// the file were not read: ...") on standard error and answers the exit status:
+// rc, but never kClean when something of the file was not read.
+int ReportLosses(const char* command, const ParsedFile& parsed, int rc);
+// A text field of CSV output: quoted when it holds a comma, quote or line
+// break. Unless raw, a text that a spreadsheet would run as a formula (one
+// that begins with '=', '+', '-', '@', a tab or a carriage return) is
+// prefixed with a single quote. Amounts and dates are not passed through here.
+std::string CsvText(const char* text, bool raw);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard
@@ -62,10 +85,62 @@ bool PromptPassword(const char* prompt, OEUserPassword& out);
 // What a statement request names.
 struct StatementRequestOptions {
   std::string org, fid, user, account, bankId, type, start, end, appId, appVersion;
+  // Brokerage statements: the broker, what to include besides transactions,
+  // and the securities to ask a security list for (comma-separated).
+  std::string brokerId, securities;
+  bool positions = false, openOrders = false, balance = false;
+  // What is asked besides the sign-on: "statement", "profile" or "accounts"
+  // (since: the date of the last account list the client holds).
+  std::string kind = "statement", since;
 };
 // Writes a sign-on + statement request file into out; false (with a message
 // on standard error) when an option is not valid.
 bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserPassword& password, OEBuffer& out);
+// Adds the brokerage statement request (and the security-list request) that
+// options name; false after a message when an option is not valid.
+bool AppendInvestmentRequest(const StatementRequestOptions& options, OERequest& request);
+// Appends to request a message set of setType holding one transaction
+// wrapper (a fresh transaction id) around inner.
+void AppendWrapped(OERequest& request, OETagID setType, OETagID wrapperType, OETagID innerTag, OETransBase* inner);
+// The response set of this type in out, appended when there is none yet.
+OEMessageSetRs* ResponseSet(OEResponse& out, OETagID type);
+// A response wrapper (status 0) around inner, answering wrapper.
+OETransRs* AnswerWrapper(const OETransRq& wrapper, OETagID type, OETagID innerTag, OETransBase* inner);
+// Adds the profile or account-information request that options name.
+bool AppendFirstContactRequest(const StatementRequestOptions& options, OERequest& request);
+// Writes a request file strictly into out; false after a message.
+bool WriteRequest(const OEFileRq& file, OEBuffer& out);
+
+// Transactions generated for one request file at most (the most that fits in
+// one response buffer), so also the largest --transactions.
+constexpr unsigned kMaxTransactionsPerFile = 25000;
+
+// What answering one request file may still cost: statements, answers and
+// generated transactions (a brokerage transaction counts as the bytes of
+// kBrokerageWeight bank ones).
+struct AnswerBudget {
+  static constexpr unsigned kMaxStatements = 64;
+  static constexpr unsigned kMaxAnswers = 1000;
+  static constexpr unsigned kBrokerageWeight = 3;
+  unsigned statements = 0, answers = 0, transactions = 0;
+  // False when the file has had all the answers it gets (the request is then
+  // not answered at all).
+  bool Answer() { return answers < kMaxAnswers && ++answers; }
+  // Null when a statement of n transactions (each of the given weight) is
+  // still allowed, and counts it; else why it is refused.
+  const char* TakeStatement(unsigned n, unsigned weight = 1);
+};
+
+// The answer to a statement request refused with status 2000 and why.
+OETransRs* RefusedStatement(const OETransRq& wrapper, OETagID wrapperType, const char* why);
+
+// The accounts `respond` and `serve` list for the demo user.
+constexpr const char* kServedBankID = "121000248";
+constexpr const char* kServedChecking = "1001";
+constexpr const char* kServedSavings = "1002";
+constexpr const char* kServedCard = "4111111111111111";
+constexpr const char* kServedBrokerID = "broker.example";
+constexpr const char* kServedBrokerage = "X12345678";
 
 // How a request is answered.
 struct RespondOptions {
@@ -84,10 +159,24 @@ bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options
 // With a user named, reads the password (from the terminal without echo, or
 // a line of standard input); false after a message when none is given.
 bool AskPassword(const char* command, RespondOptions& options);
+// Answers an investment statement or securities-list request set into out
+// (with the security list); false for a set of another type.
+bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, AnswerBudget& budget, OEResponse& out);
+// Answers a profile or signup request set into out; false for a set of
+// another type.
+bool AnswerFirstContactSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);
 // Answers request and writes the response file into out; the build status.
 OEBuildStatus WriteAnswer(const OEFileRq& request, const RespondOptions& options, OEBuffer& out);
 
+// Prints the transactions of the investment statements under root as CSV
+// (after a blank line when `separate`; text fields as CsvText makes them);
+// false when there are none.
+bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bool separate);
+
 int CmdDump(int argc, char** argv);
+int CmdPositions(int argc, char** argv);
+int CmdProfile(int argc, char** argv);
+int CmdAccounts(int argc, char** argv);
 int CmdStatement(int argc, char** argv);
 int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
@@ -95,5 +184,6 @@ int CmdExchange(int argc, char** argv);
 int CmdServe(int argc, char** argv);
 // Runs a command of the network module (exchange, serve), loading it first.
 int RunNetCommand(const char* name, int argc, char** argv);
+int CmdCheck(int argc, char** argv);
 
 }  // namespace cli

@@ -1,7 +1,11 @@
 #include <fcntl.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 #include <termios.h>
 #include <unistd.h>
 
+#include <cctype>
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
@@ -68,6 +72,9 @@ bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
     *error = path + ": " + std::strerror(errno);
     return false;
   }
+  // Straight into chunk, wiped below: no stdio buffer keeps a copy of a
+  // request's password after the file is closed.
+  std::setvbuf(f, nullptr, _IONBF, 0);
   // Room for the whole file at once, rather than growing step by step.
   if (std::fseek(f, 0, SEEK_END) == 0) {
     long size = std::ftell(f);
@@ -90,14 +97,76 @@ bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error) {
     ok = false;
   }
   std::fclose(f);
+  volatile char* wipe = chunk;
+  for (size_t i = 0; i < sizeof chunk; ++i) wipe[i] = 0;
+  return ok;
+}
+
+namespace {
+bool WriteAll(int fd, const char* data, size_t size) {
+  while (size) {
+    ssize_t n = ::write(fd, data, size);
+    if (n < 0 && errno == EINTR) continue;
+    if (n <= 0) return false;
+    data += n;
+    size -= static_cast<size_t>(n);
+  }
+  return true;
+}
+}  // namespace
+
+bool WritePrivateFile(const std::string& path, const OEBuffer& buffer, std::string* error) {
+  const char* data = buffer.GetBufferPtr();
+  const size_t size = data ? buffer.GetBufferSize() : 0;
+  struct stat info;
+  if (::lstat(path.c_str(), &info) == 0) {
+    if (S_ISLNK(info.st_mode)) {
+      *error = path + ": is a symbolic link (not followed; give the file itself)";
+      return false;
+    }
+    if (S_ISDIR(info.st_mode)) {
+      *error = path + ": is a directory";
+      return false;
+    }
+    if (!S_ISREG(info.st_mode)) {
+      // A device or a pipe (/dev/null, a FIFO) keeps nothing: written as it is.
+      int fd = ::open(path.c_str(), O_WRONLY | O_NOFOLLOW | O_CLOEXEC);
+      bool ok = fd >= 0 && WriteAll(fd, data, size);
+      if (!ok) *error = path + ": " + std::strerror(errno);
+      if (fd >= 0) ok = ::close(fd) == 0 && ok;
+      return ok;
+    }
+  }
+  size_t slash = path.rfind('/');
+  std::string folder = slash == std::string::npos ? "." : slash == 0 ? "/" : path.substr(0, slash);
+  std::string base = slash == std::string::npos ? path : path.substr(slash + 1);
+  std::vector<char> temporary;
+  for (char c : folder + (folder == "/" ? "" : "/") + "." + base + ".XXXXXX") temporary.push_back(c);
+  temporary.push_back('\0');
+  int fd = ::mkostemp(temporary.data(), O_CLOEXEC);
+  if (fd < 0) {
+    *error = path + ": " + std::strerror(errno);
+    return false;
+  }
+  bool ok = ::fchmod(fd, S_IRUSR | S_IWUSR) == 0 && WriteAll(fd, data, size) && ::fsync(fd) == 0;
+  int saved = errno;
+  ok = ::close(fd) == 0 && ok;
+  if (ok && std::rename(temporary.data(), path.c_str()) != 0) {
+    saved = errno;
+    ok = false;
+  }
+  if (!ok) {
+    ::unlink(temporary.data());
+    *error = path + ": " + std::strerror(saved);
+  }
   return ok;
 }
 
 bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* error, bool privateFile) {
+  if (privateFile && path != "-") return WritePrivateFile(path, buffer, error);
   FILE* f = stdout;
   if (path != "-") {
-    // A request holds a password: such a file is readable by its owner only.
-    int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, privateFile ? 0600 : 0644);
+    int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0644);
     f = fd >= 0 ? fdopen(fd, "wb") : nullptr;
     if (fd >= 0 && !f) ::close(fd);
   }
@@ -112,15 +181,31 @@ bool WriteFile(const std::string& path, const OEBuffer& buffer, std::string* err
   return ok;
 }
 
+void KeepSecretsOutOfCoreDumps() {
+  rlimit none{0, 0};
+  setrlimit(RLIMIT_CORE, &none);
+  prctl(PR_SET_DUMPABLE, 0, 0, 0, 0);
+}
+
 namespace {
-// Case-insensitive search for `needle` in the buffer.
-bool Contains(const OEBuffer& buffer, const char* needle) {
+inline bool TagSpace(char c) { return c == ' ' || c == '\n' || c == '\r' || c == '\t'; }
+
+// Whether the buffer holds a tag name ending in `name` (upper case), matched
+// ignoring case and followed by whitespace or '>', as the parser reads names.
+// With whole, the name must be the whole tag name: '<', blanks, then name.
+// NUL bytes do not stop the search, so that a file whose text the parser cuts
+// short is still recognised (and its loss reported).
+bool HasTagName(const OEBuffer& buffer, const char* name, bool whole) {
   const char* data = buffer.GetBufferPtr();
-  size_t size = buffer.GetBufferSize(), n = std::strlen(needle);
+  const size_t size = data ? buffer.GetBufferSize() : 0, n = std::strlen(name);
   for (size_t i = 0; i + n <= size; ++i) {
     size_t k = 0;
-    while (k < n && std::toupper(static_cast<unsigned char>(data[i + k])) == needle[k]) ++k;
-    if (k == n) return true;
+    while (k < n && std::toupper(static_cast<unsigned char>(data[i + k])) == name[k]) ++k;
+    if (k < n || (i + n < size && data[i + n] != '>' && !TagSpace(data[i + n]))) continue;
+    if (!whole) return true;
+    size_t j = i;
+    while (j > 0 && TagSpace(data[j - 1])) --j;
+    if (j > 0 && data[j - 1] == '<') return true;
   }
   return false;
 }
@@ -144,19 +229,38 @@ int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error
 }
 
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error) {
-  if (!Contains(buffer, "<OFX>")) {
+  if (!HasTagName(buffer, "OFX", true)) {
     *error = name + ": not an OFX file (no <OFX> aggregate)";
     return kBadInput;
   }
-  parsed.isResponse = Contains(buffer, "MSGSRSV1>") || !Contains(buffer, "MSGSRQV1>");
+  parsed.isResponse = HasTagName(buffer, "MSGSRSV1", false) || !HasTagName(buffer, "MSGSRQV1", false);
   if (parsed.isResponse)
     parsed.file.reset(new OEFileRs());
   else
     parsed.file.reset(new OEFileRq());
   OESimpleParser parser;
+  parser.SetReadingOptions(parsed.strict ? OE_READ_STRICT : OE_READ_TOLERANT);
   parsed.status = parser.Parse(&buffer, parsed.file.get(), 0);
   parsed.objectWithError = parser.GetObjectWithError();
+  parsed.audit = ofxkit::AuditParse(buffer, *parsed.file);
   return ExitForStatus(parsed.status);
+}
+
+int ReportLosses(const char* command, const ParsedFile& parsed, int rc) {
+  if (!parsed.audit.complete)
+    std::fprintf(stderr, "ofxkit %s: the file could not be checked for unread data (out of memory)\n", command);
+  for (const ofxkit::AuditFinding& finding : parsed.audit.findings)
+    if (finding.IsLoss()) std::fprintf(stderr, "ofxkit %s: %s\n", command, finding.Describe().c_str());
+  return parsed.audit.HasLoss() && rc == kClean ? kWarnings : rc;
+}
+
+std::string CsvText(const char* text, bool raw) {
+  std::string s(text ? text : "");
+  if (!raw && !s.empty() && std::strchr("=+-@\t\r", s[0])) s.insert(0, 1, '\'');
+  if (s.find_first_of(",\"\r\n") == std::string::npos) return s;
+  std::string quoted = "\"";
+  for (char c : s) quoted += c == '"' ? std::string("\"\"") : std::string(1, c);
+  return quoted + "\"";
 }
 
 const char* TagName(OETagID tag) {
@@ -166,6 +270,9 @@ const char* TagName(OETagID tag) {
 }
 
 bool PromptPassword(const char* prompt, OEUserPassword& out) {
+  KeepSecretsOutOfCoreDumps();
+  // Read byte by byte: no stdio buffer keeps a copy of the line.
+  std::setvbuf(stdin, nullptr, _IONBF, 0);
   bool terminal = isatty(STDIN_FILENO);
   termios saved{};
   if (terminal) {

@@ -10,10 +10,13 @@ namespace cli {
 namespace {
 
 const char kDumpHelp[] =
-    "usage: ofxkit dump [--json] FILE\n"
+    "usage: ofxkit dump [--json] [--strict] FILE\n"
     "Parses an OFX request or response file and prints its object tree, then the\n"
     "warnings of the parse (code, tag, value, position). Passwords are never shown.\n"
     "  --json   print the same as one JSON document\n"
+    "  --strict read by the OFX 1.x rules only (by default, blank lines before the\n"
+    "           headers, ENCODING:UTF-8 and empty elements are read, with warnings)\n"
+    "Data of the file that could not be read is reported on standard error.\n"
     "Exit status: 0 clean parse, 1 parsed with warnings, 2 parse failed, 3 unreadable\n"
     "or not OFX, 64 bad command line.\n";
 
@@ -61,6 +64,50 @@ void HeadersOf(const OEDataObj* obj, std::vector<Element>& out) {
       out.push_back({static_cast<OETagID>(h), Utf8(value->c_str(), HeaderName(h))});
 }
 
+// The children to show: the object's own, and a securities-list response
+// set's list, which stands beside its wrappers rather than among them.
+std::vector<const OEDataObj*> ChildrenOf(const OEDataObj* obj) {
+  std::vector<const OEDataObj*> out;
+  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
+    if (const OEDataObj* child = obj->GetChild(i)) out.push_back(child);
+  if (const auto* set = dynamic_cast<const OEMessageSetRs*>(obj))
+    if (set->GetSecList()) out.push_back(set->GetSecList());
+  return out;
+}
+
+// Any byte string as a JSON string literal. Text from a file may be in any
+// character set (or none): valid UTF-8 is kept, every other byte becomes
+// U+FFFD, and control characters are escaped, so the JSON output is always
+// well formed and writing it never fails. Every text of the JSON output
+// (headers, elements, warnings, names) goes through here.
+std::string JsonText(const std::string& bytes) {
+  std::string utf8;
+  utf8.reserve(bytes.size());
+  const unsigned char* p = reinterpret_cast<const unsigned char*>(bytes.data());
+  const size_t n = bytes.size();
+  for (size_t i = 0; i < n;) {
+    const unsigned char c = p[i];
+    size_t length = c < 0x80 ? 1 : (c >> 5) == 0x6 ? 2 : (c >> 4) == 0xE ? 3 : (c >> 3) == 0x1E ? 4 : 0;
+    bool valid = length > 0 && i + length <= n;
+    for (size_t k = 1; valid && k < length; ++k) valid = (p[i + k] & 0xC0) == 0x80;
+    if (valid && length > 1) {  // no overlong forms, surrogates or values past U+10FFFF
+      const unsigned char d = p[i + 1];
+      valid = !(c == 0xC0 || c == 0xC1 || (c == 0xE0 && d < 0xA0) || (c == 0xED && d >= 0xA0) ||
+                (c == 0xF0 && d < 0x90) || (c == 0xF4 && d >= 0x90) || c > 0xF4);
+    }
+    if (valid) {
+      utf8.append(bytes, i, length);
+      i += length;
+    } else {
+      utf8 += "\xEF\xBF\xBD";
+      ++i;
+    }
+  }
+  return nlohmann::json(utf8).dump(-1, ' ', false, nlohmann::json::error_handler_t::replace);
+}
+
+std::string JsonText(const char* text) { return JsonText(std::string(text ? text : "")); }
+
 void DumpText(const OEDataObj* obj, int depth, FILE* out) {
   std::string indent(static_cast<size_t>(depth) * 2, ' ');
   std::fprintf(out, "%s%s\n", indent.c_str(), TagName(obj->GetType()));
@@ -70,41 +117,40 @@ void DumpText(const OEDataObj* obj, int depth, FILE* out) {
     std::fprintf(out, "%s  %s:%s\n", indent.c_str(), HeaderName(h.tag), h.value.c_str());
   for (const Element& e : ElementsOf(obj))
     std::fprintf(out, "%s  %s = %s\n", indent.c_str(), TagName(e.tag), e.value.c_str());
-  unsigned short n = obj->GetNumberOfChildren();
-  for (unsigned short i = 0; i < n; ++i)
-    if (const OEDataObj* child = obj->GetChild(i)) DumpText(child, depth + 1, out);
+  for (const OEDataObj* child : ChildrenOf(obj)) DumpText(child, depth + 1, out);
 }
 
 // Streams the tree as JSON, one object at a time, so a large statement does
 // not need its whole JSON document in memory.
 void DumpJson(const OEDataObj* obj, FILE* out) {
-  std::fprintf(out, "{\"type\":%s", nlohmann::json(TagName(obj->GetType())).dump().c_str());
+  std::fprintf(out, "{\"type\":%s", JsonText(TagName(obj->GetType())).c_str());
   std::vector<Element> headers;
   HeadersOf(obj, headers);
-  if (!headers.empty()) {
-    nlohmann::ordered_json h = nlohmann::ordered_json::object();
-    for (const Element& e : headers) h[HeaderName(e.tag)] = e.value;
-    std::fprintf(out, ",\"headers\":%s", h.dump().c_str());
-  }
+  for (size_t i = 0; i < headers.size(); ++i)
+    std::fprintf(out, "%s%s:%s", i ? "," : ",\"headers\":{", JsonText(HeaderName(headers[i].tag)).c_str(),
+                 JsonText(headers[i].value).c_str());
+  if (!headers.empty()) std::fprintf(out, "}");
+  // Elements by name; a repeated element gives an array of its values.
   std::vector<Element> elements = ElementsOf(obj);
-  if (!elements.empty()) {
-    nlohmann::ordered_json els = nlohmann::ordered_json::object();
-    for (const Element& e : elements) {
-      const char* name = TagName(e.tag);
-      if (!els.contains(name))
-        els[name] = e.value;
-      else if (els[name].is_array())
-        els[name].push_back(e.value);
-      else
-        els[name] = nlohmann::ordered_json::array({els[name], e.value});
-    }
-    std::fprintf(out, ",\"elements\":%s", els.dump(-1, ' ', false, nlohmann::ordered_json::error_handler_t::replace).c_str());
-  }
-  unsigned short n = obj->GetNumberOfChildren();
+  std::vector<bool> written(elements.size(), false);
   bool first = true;
-  for (unsigned short i = 0; i < n; ++i) {
-    const OEDataObj* child = obj->GetChild(i);
-    if (!child) continue;
+  for (size_t i = 0; i < elements.size(); ++i) {
+    if (written[i]) continue;
+    std::vector<size_t> same;
+    for (size_t k = i; k < elements.size(); ++k)
+      if (!written[k] && elements[k].tag == elements[i].tag) same.push_back(k);
+    std::fprintf(out, "%s%s:%s", first ? ",\"elements\":{" : ",", JsonText(TagName(elements[i].tag)).c_str(),
+                 same.size() > 1 ? "[" : "");
+    first = false;
+    for (size_t k = 0; k < same.size(); ++k) {
+      std::fprintf(out, "%s%s", k ? "," : "", JsonText(elements[same[k]].value).c_str());
+      written[same[k]] = true;
+    }
+    if (same.size() > 1) std::fprintf(out, "]");
+  }
+  if (!first) std::fprintf(out, "}");
+  first = true;
+  for (const OEDataObj* child : ChildrenOf(obj)) {
     std::fprintf(out, first ? ",\"children\":[" : ",");
     first = false;
     DumpJson(child, out);
@@ -113,11 +159,12 @@ void DumpJson(const OEDataObj* obj, FILE* out) {
   std::fprintf(out, "}");
 }
 
-nlohmann::json WarningJson(const OEParseException& w) {
-  return {{"code", OEParseException::WarningName(w.warning)},
-          {"tag", w.tag ? TagName(w.tag) : Utf8(w.tagName.c_str(), "a warning")},
-          {"value", Utf8(w.value.c_str(), "a warning")},
-          {"position", w.position}};
+void WarningJson(const OEParseException& w, FILE* out) {
+  std::fprintf(out, "{\"code\":%s,\"tag\":%s,\"value\":%s,\"position\":%d}",
+               JsonText(OEParseException::WarningName(w.warning)).c_str(),
+               JsonText(w.tag ? TagName(w.tag) : Utf8(w.tagName.c_str(), "a warning")).c_str(),
+               JsonText(Utf8(w.value.c_str(), "a warning")).c_str(),
+               static_cast<int>(w.position));
 }
 
 }  // namespace
@@ -129,6 +176,7 @@ int CmdDump(int argc, char** argv) {
     return kClean;
   }
   bool json = args.Flag("json");
+  bool strict = args.Flag("strict");
   std::string error;
   std::vector<std::string> files = args.Positional(&error);
   if (!error.empty() || files.size() != 1) {
@@ -136,6 +184,7 @@ int CmdDump(int argc, char** argv) {
     return kUsage;
   }
   ParsedFile parsed;
+  parsed.strict = strict;
   int rc = ParseOFXFile(files[0], parsed, &error);
   if (rc == kBadInput) {
     std::fprintf(stderr, "ofxkit dump: %s\n", error.c_str());
@@ -148,9 +197,10 @@ int CmdDump(int argc, char** argv) {
     std::fprintf(stdout, "{\"status\":%d,\"tree\":", static_cast<int>(parsed.status));
     DumpJson(parsed.file.get(), stdout);
     std::fprintf(stdout, ",\"warnings\":[");
-    for (unsigned short i = 0; i < log->Entries(); ++i)
-      std::fprintf(stdout, "%s%s", i ? "," : "", WarningJson(*log->Get(i)).dump(-1, ' ', false,
-                                                                          nlohmann::ordered_json::error_handler_t::replace).c_str());
+    for (unsigned short i = 0; i < log->Entries(); ++i) {
+      if (i) std::fprintf(stdout, ",");
+      WarningJson(*log->Get(i), stdout);
+    }
     std::fprintf(stdout, "]}\n");
   } else {
     DumpText(parsed.file.get(), 0, stdout);
@@ -165,7 +215,7 @@ int CmdDump(int argc, char** argv) {
   }
   g_text = nullptr;
   if (!text.Report().empty()) std::fprintf(stderr, "ofxkit dump: %s\n", text.Report().c_str());
-  return rc;
+  return ReportLosses("dump", parsed, rc);
 }
 
 }  // namespace cli

@@ -1,5 +1,6 @@
 // ofxkit exchange: posts a request file to a server through the gateway
 // transport, saves the reply and dumps it.
+#include <signal.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -26,13 +27,33 @@ const char* const kExchangeHelp =
     "  --expect-cert-id ID     accept only a server certificate with that identity (base64\n"
     "                          SHA-1 of its DER); at most two\n"
     "  --builtin-roots         trust the library's built-in roots\n"
-    "  --no-verify             do not verify the server's chain (roots and identities still apply)\n"
-    "  --timeout SECONDS       give up on a transfer after that long\n"
+    "  --no-verify             skip only the validity dates and the host name of the server's\n"
+    "                          certificate; its chain must still verify up to a trusted root\n"
+    "                          (signatures, key sizes, CA flags), and --trust and\n"
+    "                          --expect-cert-id still apply\n"
+    "  --timeout SECONDS       give up on a transfer after that long (default 300; 0: never)\n"
     "  --quiet                 no progress line\n"
     "  --verbose               print the transport's log lines on standard error\n"
     "Exit status: as for dump, or 4 when the transfer failed.\n";
 
 constexpr int kTransferFailed = 4;
+constexpr const char* kDefaultTimeout = "300";
+
+// SIGINT or SIGTERM, once one arrived: the transfer is cancelled and its
+// temporary files removed before the tool exits with 128 + the signal.
+volatile sig_atomic_t g_stopSignal = 0;
+
+extern "C" void OnStopSignal(int signal) { g_stopSignal = signal; }
+
+GXNWaitAction StopOnSignal(void*) { return g_stopSignal ? GXN_WAIT_QUIT : GXN_WAIT_CONTINUE; }
+
+void CatchStopSignals() {
+  struct sigaction action {};
+  action.sa_handler = OnStopSignal;
+  sigemptyset(&action.sa_mask);
+  sigaction(SIGINT, &action, nullptr);
+  sigaction(SIGTERM, &action, nullptr);
+}
 
 bool g_verbose = false;
 bool g_progress = true;
@@ -150,7 +171,7 @@ int CmdExchange(int argc, char** argv) {
   g_progress = !args.Flag("quiet");
   g_state.terminal = isatty(STDERR_FILENO) != 0;
   g_verbose = args.Flag("verbose");
-  std::string timeout = args.Option("timeout");
+  std::string timeout = args.HasOption("timeout") ? args.Option("timeout") : kDefaultTimeout;
   std::string output = args.Option("o");
   std::string error;
   std::vector<std::string> positional = args.Positional(&error);
@@ -166,6 +187,16 @@ int CmdExchange(int argc, char** argv) {
   const std::string& url = positional[1];
   if (output.empty()) output = DefaultReplyPath(requestPath);
 
+  char* end = nullptr;
+  long seconds = std::strtol(timeout.c_str(), &end, 10);
+  if (timeout.empty() || *end || seconds < 0 || seconds > 86400) {
+    std::fprintf(stderr, "ofxkit exchange: --timeout takes a number of seconds up to 86400\n%s", kExchangeHelp);
+    return kUsage;
+  }
+
+  // The request file holds the user's password.
+  KeepSecretsOutOfCoreDumps();
+  CatchStopSignals();
   OEBuffer body;
   if (!ReadFile(requestPath, body, &error)) {
     std::fprintf(stderr, "ofxkit exchange: %s\n", error.c_str());
@@ -174,6 +205,7 @@ int CmdExchange(int argc, char** argv) {
   GXNNetAccess access;
   access.SetLogCallback(PrintLogLine);
   access.SetSessionCallback(PrintProgress);
+  access.SetWaitHook(StopOnSignal, nullptr);
   OENetStatus status = access.InitConnection();
   if (status != OE_NET_OK) {
     std::fprintf(stderr, "ofxkit exchange: the network session could not be opened (netstatus %d)\n",
@@ -196,17 +228,23 @@ int CmdExchange(int argc, char** argv) {
   for (const std::string& id : expected)
     request->AddExpectedSSLCertID(id.data(), static_cast<unsigned short>(std::min<size_t>(id.size(), 0xFFFF)));
   if (noVerify) request->SetSSLVerifyCert(0);
-  if (!timeout.empty()) request->SetTimeout(static_cast<int32_t>(std::strtol(timeout.c_str(), nullptr, 10)));
+  request->SetTimeout(static_cast<int32_t>(seconds));
 
   status = OENetRequest::HasFileScheme(url.c_str()) ? request->Get(OEString(url.c_str()))
                                                      : request->Send(OEString(url.c_str()), &body);
+  body.ClearBuffer('\0');
   FinishProgress();
   uint32_t http = 0, gatewayError = 0;
   request->GetStatus(http, gatewayError);
   OEBuffer reply;
-  if (status == OE_NET_OK) status = request->LoadReply(&reply);
+  if (status == OE_NET_OK && !g_stopSignal) status = request->LoadReply(&reply);
+  // Deleting the request removes whatever temporary files it still has.
   access.DeleteNetRequest(request.release());
   access.EndConnection();
+  if (g_stopSignal) {
+    std::fprintf(stderr, "ofxkit exchange: stopped by a signal; nothing was saved\n");
+    return 128 + g_stopSignal;
+  }
   if (status != OE_NET_OK) {
     std::string http_text = gatewayError >= GX_ERR_HTTP_FIRST && gatewayError <= GX_ERR_HTTP_LAST
                                 ? ", HTTP " + std::to_string(http)

@@ -18,11 +18,15 @@ struct Command {
 };
 const Command kCommands[] = {
     {"dump", cli::CmdDump, "print the object tree and warnings of an OFX file (text or --json)"},
-    {"statement", cli::CmdStatement, "print the transactions of bank and card statements as CSV"},
+    {"statement", cli::CmdStatement, "print the transactions of bank, card and investment statements as CSV"},
+    {"positions", cli::CmdPositions, "print the positions (or --balances) of investment statements as CSV"},
+    {"profile", cli::CmdProfile, "print what an institution supports, from a profile response"},
+    {"accounts", cli::CmdAccounts, "print the accounts of an account-information response as CSV"},
     {"request", cli::CmdRequest, "write an OFX request file (request statement ...)"},
     {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
     {"exchange", Exchange, "post a request file to a server (http:, https:) and dump the reply"},
     {"serve", Serve, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
+    {"check", cli::CmdCheck, "print the warnings of a file's parse and every part of the file that was not read"},
 };
 
 void Usage(FILE* out) {

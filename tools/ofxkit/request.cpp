@@ -11,13 +11,27 @@ namespace {
 
 const char kRequestHelp[] =
     "usage: ofxkit request statement --org ORG --fid FID --user USER --account ACCT\n"
-    "                                [--bank-id ROUTING] [--type CHECKING|SAVINGS|MONEYMRKT|CREDITLINE|CARD]\n"
+    "                                [--bank-id ROUTING] [--broker-id ID]\n"
+    "                                [--type CHECKING|SAVINGS|MONEYMRKT|CREDITLINE|CARD|INVESTMENT]\n"
     "                                [--start YYYYMMDD] [--end YYYYMMDD] [--password-stdin]\n"
+    "                                [--positions] [--open-orders] [--balance] [--securities LIST]\n"
     "                                [--app-id QWIN] [--app-version 2700] [-o FILE]\n"
     "Writes an OFX request file: a sign-on and one bank (or, with --type CARD, credit\n"
-    "card) statement request with a fresh transaction id. The password is asked for\n"
-    "on the terminal without echo; --password-stdin reads it from standard input.\n"
-    "--bank-id is needed for bank accounts. Without -o the file goes to standard output.\n";
+    "card; with --type INVESTMENT, brokerage) statement request with a fresh\n"
+    "transaction id. The password is asked for on the terminal without echo;\n"
+    "--password-stdin reads it from standard input. --bank-id is needed for bank\n"
+    "accounts, --broker-id for brokerage accounts. A brokerage statement asks for\n"
+    "transactions and, with --positions, --open-orders and --balance, for those too;\n"
+    "--securities adds a security-list request for the securities named in LIST\n"
+    "(comma-separated tickers, or TYPE:ID such as CUSIP:037833100).\n"
+    "Without -o the file goes to standard output.\n"
+    "\n"
+    "usage: ofxkit request profile --org ORG --fid FID --user USER [--password-stdin] [-o FILE]\n"
+    "       ofxkit request accounts --org ORG --fid FID --user USER [--since YYYYMMDD]\n"
+    "                               [--password-stdin] [-o FILE]\n"
+    "First contact with an institution: a sign-on and a profile request (what it\n"
+    "supports), or an account-information request (which accounts the user holds;\n"
+    "--since asks only for changes after that date).\n";
 
 bool Fail(const std::string& message) {
   std::fprintf(stderr, "ofxkit request: %s\n", message.c_str());
@@ -57,6 +71,8 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
   signOn->SetAppId(o.appId.c_str());
   if (!signOn->SetAppVer(OEString(o.appVersion.c_str()))) return Fail("--app-version must be a number like 2700");
 
+  if (o.kind != "statement") return AppendFirstContactRequest(o, *request) && WriteRequest(file, out);
+  if (o.type == "INVESTMENT") return AppendInvestmentRequest(o, *request) && WriteRequest(file, out);
   bool card = o.type == "CARD";
   OEMessageSetRq* set = new OEMessageSetRq();
   set->SetType(card ? OE_TAG_CREDITCARDMSGSRQV1 : OE_TAG_BANKMSGSRQV1);
@@ -106,9 +122,12 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
   statement->SetIncTransaction(include);
   wrapper->SetActualTrans(statement);
   wrapper->SetTag(card ? OE_TAG_CCSTMTRQ : OE_TAG_STMTRQ);
+  return WriteRequest(file, out);
+}
 
+bool WriteRequest(const OEFileRq& file, OEBuffer& out) {
   OEBuilder builder;
-  OEBuildStatus status = builder.Build(&out, &file, OE_BUILD_STRICT, 1);
+  OEBuildStatus status = builder.Build(&out, const_cast<OEFileRq*>(&file), OE_BUILD_STRICT, 1);
   if (status != OE_BUILD_OK) {
     OEDataObj* where = builder.GetObjectInError();
     return Fail("the request could not be written (build status " + std::to_string(status) +
@@ -119,8 +138,10 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
 
 int CmdRequest(int argc, char** argv) {
   Args args(argc, argv, 2);
-  if (args.Flag("help") || argc < 3 || std::strcmp(argv[2], "statement") != 0) {
-    bool asked = argc >= 3 && (!std::strcmp(argv[2], "--help") || !std::strcmp(argv[2], "statement"));
+  const bool known = argc >= 3 && (!std::strcmp(argv[2], "statement") || !std::strcmp(argv[2], "profile") ||
+                                   !std::strcmp(argv[2], "accounts"));
+  if (args.Flag("help") || !known) {
+    bool asked = argc >= 3 && (!std::strcmp(argv[2], "--help") || known);
     std::fputs(kRequestHelp, asked ? stdout : stderr);
     return asked ? kClean : kUsage;
   }
@@ -130,15 +151,22 @@ int CmdRequest(int argc, char** argv) {
     return kClean;
   }
   StatementRequestOptions o;
+  o.kind = argv[2];
   o.org = options.Option("org");
   o.fid = options.Option("fid");
   o.user = options.Option("user");
   o.account = options.Option("account");
   o.bankId = options.Option("bank-id");
+  o.brokerId = options.Option("broker-id");
+  o.positions = options.Flag("positions");
+  o.openOrders = options.Flag("open-orders");
+  o.balance = options.Flag("balance");
+  o.securities = options.Option("securities");
   o.type = options.Option("type");
   if (o.type.empty()) o.type = "CHECKING";
   for (char& c : o.type) c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
   o.start = options.Option("start");
+  o.since = options.Option("since");
   o.end = options.Option("end");
   o.appId = options.Option("app-id");
   if (o.appId.empty()) o.appId = "QWIN";
@@ -149,10 +177,13 @@ int CmdRequest(int argc, char** argv) {
   bool passwordFromStdin = options.Flag("password-stdin");
   std::string error;
   std::vector<std::string> rest = options.Positional(&error);
-  if (!error.empty() || !rest.empty() || o.org.empty() || o.user.empty() || o.account.empty()) {
+  if (!error.empty() || !rest.empty() || o.org.empty() || o.user.empty() ||
+      (o.kind == "statement" && o.account.empty())) {
     std::fprintf(stderr, "ofxkit request: %s\n%s",
                  !error.empty() ? error.c_str() : !rest.empty() ? "unexpected arguments"
-                                                                : "--org, --user and --account are needed",
+                                                                : o.kind == "statement"
+                                                                      ? "--org, --user and --account are needed"
+                                                                      : "--org and --user are needed",
                  kRequestHelp);
     return kUsage;
   }

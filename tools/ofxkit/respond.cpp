@@ -12,10 +12,13 @@ namespace {
 const char kRespondHelp[] =
     "usage: ofxkit respond [--transactions N] [--user USER --password-stdin] REQUEST [-o FILE]\n"
     "Reads an OFX request file and writes the response a bank would send: a sign-on\n"
-    "response and, for each bank or card statement request, a statement with N\n"
-    "generated transactions (default 25) between the requested dates. With --user\n"
+    "response and, for each bank, card or investment statement request, a statement\n"
+    "with N generated transactions (default 25) between the requested dates; an\n"
+    "investment statement comes with the security list it refers to. With --user\n"
     "(and the password on standard input) the credentials are checked: a mismatch is\n"
-    "answered with sign-on status 15500 and no statement.\n";
+    "answered with sign-on status 15500 and no statement.\n"
+    "A file is answered with at most 64 statements and 25000 transactions in all;\n"
+    "statement requests beyond that are answered with status 2000 (error).\n";
 
 // A small deterministic generator, so the same request gives the same reply.
 struct Sequence {
@@ -94,13 +97,62 @@ OEGenericStatementRs* MakeStatement(const OEGenericStatementRq& rq, bool card, u
   return rs;
 }
 
+// A response is written into one buffer of at most 4,000,000 bytes; a
+// generated bank transaction takes up to about 130 bytes and a brokerage one
+// about three times that, so a file is answered with at most
+// kMaxTransactionsPerFile (weighted) transactions in all, in at most
+// AnswerBudget::kMaxStatements statements. Statement requests beyond either
+// bound are answered with an error status, and inner requests beyond
+// AnswerBudget::kMaxAnswers get no answer at all.
+}  // namespace
+
+const char* AnswerBudget::TakeStatement(unsigned n, unsigned weight) {
+  if (statements >= kMaxStatements) return "Too many statement requests in one file";
+  if (transactions + n * weight > kMaxTransactionsPerFile) return "Too many transactions requested in one file";
+  ++statements;
+  transactions += n * weight;
+  return nullptr;
+}
+
+OETransRs* RefusedStatement(const OETransRq& wrapper, OETagID wrapperType, const char* why) {
+  OETransRs* rsWrapper = new OETransRs();
+  rsWrapper->SetType(wrapperType);
+  rsWrapper->SetTransUserID(wrapper.GetTransUserID());
+  rsWrapper->SetStatus(NewStatus(2000, OE_SEVERITY_ERROR, why));
+  return rsWrapper;
+}
+
+namespace {
+
+// Whether the request's sign-on is accepted, decided before anything else is
+// answered, wherever the sign-on stands among the message sets: with
+// credentials to check, every sign-on must carry them, and a request
+// without one is refused.
+bool SignOnAccepted(const OEFileRq& request, const RespondOptions& options) {
+  if (!options.checkCredentials) return true;
+  bool seen = false;
+  for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
+    const OERequest* rq = request.GetRequest(r);
+    for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
+      const OEMessageSetRq* set = rq->GetMessageSet(m);
+      if (!set || set->GetType() != OE_TAG_SIGNONMSGSRQV1) continue;
+      const OESignOnRq* signOn = set->GetSignOnRq();
+      if (!signOn || !(signOn->GetUserId() == options.user.c_str()) || !(signOn->GetUserPass() == options.password))
+        return false;
+      seen = true;
+    }
+  }
+  return seen;
+}
+
 }  // namespace
 
 bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFileRs& response) {
   response.SetHeader(OE_HEADER_OFXHEADER, "100");
   OEResponse* out = new OEResponse();
   response.AppendResponse(out);
-  bool signedOn = true;
+  const bool signedOn = SignOnAccepted(request, options);
+  AnswerBudget budget;
   for (unsigned short r = 0; r < request.GetNumberOfRequest(); ++r) {
     const OERequest* rq = request.GetRequest(r);
     for (unsigned short m = 0; rq && m < rq->GetNumMessage(); ++m) {
@@ -108,8 +160,6 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
       if (!set) continue;
       if (set->GetType() == OE_TAG_SIGNONMSGSRQV1) {
         const OESignOnRq* signOn = set->GetSignOnRq();
-        if (options.checkCredentials)
-          signedOn = signOn && signOn->GetUserId() == options.user.c_str() && signOn->GetUserPass() == options.password;
         OEMessageSetRs* rsSet = new OEMessageSetRs();
         rsSet->SetType(OE_TAG_SIGNONMSGSRSV1);
         OESignOnRs* signOnRs = new OESignOnRs();
@@ -126,6 +176,9 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         out->AppendMessageSet(rsSet);
         continue;
       }
+      if (signedOn && (AnswerInvestmentSet(*set, options.transactions, budget, *out) ||
+                       AnswerFirstContactSet(*set, budget, *out)))
+        continue;
       bool card = set->GetType() == OE_TAG_CREDITCARDMSGSRQV1;
       if (!signedOn || (set->GetType() != OE_TAG_BANKMSGSRQV1 && !card)) continue;
       OEMessageSetRs* rsSet = new OEMessageSetRs();
@@ -134,7 +187,11 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         const OETransRq* wrapper = set->GetTrans(t);
         const OEGenericStatementRq* stmt =
             wrapper ? dynamic_cast<const OEGenericStatementRq*>(wrapper->GetActualTrans()) : nullptr;
-        if (!stmt) continue;
+        if (!stmt || !budget.Answer()) continue;
+        if (const char* refused = budget.TakeStatement(options.transactions)) {
+          rsSet->AppendTrans(RefusedStatement(*wrapper, card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS, refused));
+          continue;
+        }
         OETransRs* rsWrapper = new OETransRs();
         rsWrapper->SetType(card ? OE_TAG_CCSTMTTRNRS : OE_TAG_STMTTRNRS);
         rsWrapper->SetTransUserID(wrapper->GetTransUserID());
@@ -154,8 +211,8 @@ bool ReadRespondOptions(Args& args, const char* command, RespondOptions& options
   if (!count.empty()) {
     char* end = nullptr;
     unsigned long n = std::strtoul(count.c_str(), &end, 10);
-    if (*end || n > 60000) {
-      std::fprintf(stderr, "ofxkit %s: --transactions takes a number up to 60000\n", command);
+    if (*end || n > kMaxTransactionsPerFile) {
+      std::fprintf(stderr, "ofxkit %s: --transactions takes a number up to %u\n", command, kMaxTransactionsPerFile);
       return false;
     }
     options.transactions = static_cast<unsigned>(n);

@@ -16,6 +16,7 @@ namespace {
 
 const char kServeHelp[] =
     "usage: ofxkit serve [--https [--cert-out FILE]] [--port N] [--max-requests N] [--max-seconds N]\n"
+    "                    [--request-seconds N]\n"
     "                    [--transactions N] [--user USER [--password-stdin]] [--ready-file FILE]\n"
     "Answers OFX requests POSTed to any path of 127.0.0.1:PORT (an unused port by\n"
     "default) with a sign-on response and generated statements, as 'ofxkit respond'\n"
@@ -24,7 +25,8 @@ const char kServeHelp[] =
     "writes the authority's certificate (DER) for clients to trust. Prints\n"
     "'listening on URL' once ready (and writes URL to the --ready-file), logs one line\n"
     "per request on standard error, and ends after --max-requests, --max-seconds, or\n"
-    "on SIGINT/SIGTERM.\n";
+    "on SIGINT/SIGTERM. Each connection gets at most --request-seconds (default 30)\n"
+    "from its acceptance to its answer.\n";
 
 // Read by the signal handler: an atomic pointer is lock-free, hence safe there.
 std::atomic<loopback::Server*> g_server{nullptr};
@@ -88,17 +90,14 @@ bool WriteText(const std::string& path, const std::string& text, std::string* er
   return WriteFile(path, buffer, error);
 }
 
-// Writes the URL under a temporary name, then renames it, so that a script
-// waiting for the file never reads half of it.
+// Writes the URL into a new file of an unpredictable name beside path, then
+// renames it, so that a script waiting for the file never reads half of it
+// and nobody can plant a file or link under the temporary name.
 bool WriteReadyFile(const std::string& path, const std::string& url, std::string* error) {
-  std::string partial = path + ".tmp";
-  if (!WriteText(partial, url + "\n", error)) return false;
-  if (std::rename(partial.c_str(), path.c_str()) != 0) {
-    *error = "cannot rename " + partial;
-    std::remove(partial.c_str());
-    return false;
-  }
-  return true;
+  OEBuffer buffer;
+  const std::string line = url + "\n";
+  buffer.WriteLarge(line.data(), static_cast<uint32_t>(line.size()));
+  return WritePrivateFile(path, buffer, error);
 }
 
 int Number(const std::string& text, int fallback) {
@@ -123,13 +122,15 @@ int CmdServe(int argc, char** argv) {
   server.port = Number(args.Option("port"), 0);
   server.maxRequests = Number(args.Option("max-requests"), 0);
   server.maxSeconds = Number(args.Option("max-seconds"), 0);
+  server.requestSeconds = Number(args.Option("request-seconds"), 30);
   RespondOptions options;
   if (!ReadRespondOptions(args, "serve", options)) return kUsage;
   std::string error;
   std::vector<std::string> rest = args.Positional(&error);
   if (error.empty() && !rest.empty()) error = "unexpected argument " + rest[0];
-  if (error.empty() && (server.port < 0 || server.port > 65535 || server.maxRequests < 0 || server.maxSeconds < 0))
-    error = "--port, --max-requests and --max-seconds take small numbers";
+  if (error.empty() && (server.port < 0 || server.port > 65535 || server.maxRequests < 0 || server.maxSeconds < 0 ||
+                         server.requestSeconds < 1))
+    error = "--port, --max-requests, --max-seconds and --request-seconds take small numbers";
   if (error.empty() && !certOut.empty() && !server.https) error = "--cert-out needs --https";
   if (!error.empty()) {
     std::fprintf(stderr, "ofxkit serve: %s\n%s", error.c_str(), kServeHelp);
@@ -168,6 +169,11 @@ int CmdServe(int argc, char** argv) {
   sigemptyset(&action.sa_mask);
   sigaction(SIGINT, &action, nullptr);
   sigaction(SIGTERM, &action, nullptr);
+  // A client that hangs up while being answered must not end the server.
+  struct sigaction ignore {};
+  ignore.sa_handler = SIG_IGN;
+  sigemptyset(&ignore.sa_mask);
+  sigaction(SIGPIPE, &ignore, nullptr);
   const std::string url = listener.BaseURL() + "/";
   std::printf("listening on %s\n", url.c_str());
   std::fflush(stdout);

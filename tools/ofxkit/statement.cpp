@@ -9,20 +9,20 @@ namespace cli {
 namespace {
 
 const char kStatementHelp[] =
-    "usage: ofxkit statement [--account] FILE\n"
+    "usage: ofxkit statement [--account] [--raw] [--strict] FILE\n"
     "Prints the transactions of every bank and credit-card statement of an OFX\n"
     "response file as CSV: date,amount,type,fitid,name,memo,checknum\n"
     "(dates as YYYY-MM-DD; with --account, a first column names the account).\n"
-    "Exit status as for 'ofxkit dump'.\n";
-
-// A CSV field: quoted when it holds a comma, quote or line break.
-std::string Csv(const char* text) {
-  std::string s(text ? text : "");
-  if (s.find_first_of(",\"\r\n") == std::string::npos) return s;
-  std::string q = "\"";
-  for (char c : s) q += c == '"' ? std::string("\"\"") : std::string(1, c);
-  return q + "\"";
-}
+    "Text that a spreadsheet would run as a formula (beginning with = + - @, a tab\n"
+    "or a carriage return) is prefixed with ' unless --raw is given; amounts never are.\n"
+    "--strict reads by the OFX 1.x rules only, as 'ofxkit dump --strict' does.\n"
+    "Investment statements follow (after a blank line when both are present),\n"
+    "one row per transaction of every kind in trade-date order:\n"
+    "date,kind,security,name,units,unitprice,commission,total,subacctsec,\n"
+    "subacctfund,subacctfrom,subacctto,fitid,memo (security is the ticker when\n"
+    "the file's security list names one, else the security id).\n"
+    "Transactions of the file that could not be read are reported on standard\n"
+    "error, and the exit status is then never 0. Exit status as for 'ofxkit dump'.\n";
 
 std::string IsoDate(const OEBankStatementTx& tx) {
   if (!tx.ValidateTag(OE_TAG_DTPOSTED)) return "";
@@ -65,6 +65,8 @@ int CmdStatement(int argc, char** argv) {
     return kClean;
   }
   bool withAccount = args.Flag("account");
+  bool raw = args.Flag("raw");
+  bool strict = args.Flag("strict");
   std::string error;
   std::vector<std::string> files = args.Positional(&error);
   if (!error.empty() || files.size() != 1) {
@@ -73,6 +75,7 @@ int CmdStatement(int argc, char** argv) {
     return kUsage;
   }
   ParsedFile parsed;
+  parsed.strict = strict;
   int rc = ParseOFXFile(files[0], parsed, &error);
   if (rc == kBadInput) {
     std::fprintf(stderr, "ofxkit statement: %s\n", error.c_str());
@@ -84,24 +87,27 @@ int CmdStatement(int argc, char** argv) {
   std::vector<const OEGenericStatementRs*> statements;
   CollectStatements(parsed.file.get(), statements);
   Utf8Converter text(CharsetOf(*parsed.file));
-  std::printf("%sdate,amount,type,fitid,name,memo,checknum\n", withAccount ? "account," : "");
+  if (!statements.empty()) std::printf("%sdate,amount,type,fitid,name,memo,checknum\n", withAccount ? "account," : "");
   for (const OEGenericStatementRs* rs : statements) {
     const OEBankTransactionList* list = rs->GetBankTransactionList();
     if (!list) continue;
-    std::string account = withAccount ? Csv(text(AccountName(*rs).c_str(), "the account").c_str()) + "," : "";
+    std::string account = withAccount ? CsvText(text(AccountName(*rs).c_str(), "the account").c_str(), raw) + "," : "";
     for (unsigned short i = 0; i < list->GetNumStatementTx(); ++i) {
       const OEBankStatementTx* tx = list->GetStatementTx(i);
       if (!tx) continue;
       const char* type = tx->ValidateTag(OE_TAG_TRNTYPE) ? OEDataConversion::Text(tx->GetTxType()) : "";
       std::printf("%s%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), IsoDate(*tx).c_str(), Amount(*tx).c_str(),
-                  Csv(type).c_str(), Csv(text(tx->GetFITId(), "FITID").c_str()).c_str(),
-                  Csv(text(tx->GetName(), "NAME").c_str()).c_str(), Csv(text(tx->GetMemo(), "MEMO").c_str()).c_str(),
-                  Csv(text(tx->GetCheckNum(), "CHEQUENUM").c_str()).c_str());
+                  CsvText(type, raw).c_str(), CsvText(text(tx->GetFITId(), "FITID").c_str(), raw).c_str(),
+                  CsvText(text(tx->GetName(), "NAME").c_str(), raw).c_str(),
+                  CsvText(text(tx->GetMemo(), "MEMO").c_str(), raw).c_str(),
+                  CsvText(text(tx->GetCheckNum(), "CHEQUENUM").c_str(), raw).c_str());
     }
   }
-  if (statements.empty()) std::fprintf(stderr, "ofxkit statement: no bank or card statement in %s\n", files[0].c_str());
+  bool investments = PrintInvestmentTransactions(parsed.file.get(), withAccount, raw, !statements.empty());
+  if (statements.empty() && !investments)
+    std::fprintf(stderr, "ofxkit statement: no bank, card or investment statement in %s\n", files[0].c_str());
   if (!text.Report().empty()) std::fprintf(stderr, "ofxkit statement: %s\n", text.Report().c_str());
-  return rc;
+  return ReportLosses("statement", parsed, rc);
 }
 
 }  // namespace cli

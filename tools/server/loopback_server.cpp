@@ -16,6 +16,7 @@
 #include <openssl/x509.h>
 #include <openssl/x509v3.h>
 #include <poll.h>
+#include <signal.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
@@ -100,7 +101,8 @@ bool AddExtension(X509* cert, X509* issuer, int nid, const char* value) {
 // A certificate for subject (O, CN) with key, valid from a day ago for
 // `days`, issued by issuer (or by itself when issuer is null).
 Cert MakeCert(const std::string& org, const std::string& cn, EVP_PKEY* key, X509* issuer, EVP_PKEY* issuerKey,
-              long days, const std::vector<std::pair<int, const char*>>& extensions) {
+              long days, const std::vector<std::pair<int, const char*>>& extensions,
+              const EVP_MD* digest = EVP_sha256()) {
   Cert cert(X509_new());
   if (!cert) return nullptr;
   X509_set_version(cert.get(), 2);
@@ -123,7 +125,7 @@ Cert MakeCert(const std::string& org, const std::string& cn, EVP_PKEY* key, X509
   X509* signer = issuer ? issuer : cert.get();
   for (const auto& ext : extensions)
     if (!AddExtension(cert.get(), signer, ext.first, ext.second)) return nullptr;
-  if (X509_sign(cert.get(), issuerKey ? issuerKey : key, EVP_sha256()) <= 0) return nullptr;
+  if (!digest || X509_sign(cert.get(), issuerKey ? issuerKey : key, digest) <= 0) return nullptr;
   return cert;
 }
 
@@ -146,18 +148,18 @@ struct Authority::Impl {
   PKey caKey, serverKey;
   Cert ca, server;
   std::string caDER, serverDER;
+  std::string organisation;
 };
 
 Authority::Authority() : m_impl(new Impl) {}
 Authority::~Authority() = default;
 
 std::unique_ptr<Authority> Authority::Make(const std::string& organisation, const std::string& commonName,
-                                           std::string* error) {
+                                           std::string* error, const LeafOptions& leaf) {
   std::unique_ptr<Authority> authority(new Authority());
   Impl& im = *authority->m_impl;
   im.caKey.reset(EVP_RSA_gen(2048));
-  im.serverKey.reset(EVP_RSA_gen(2048));
-  if (!im.caKey || !im.serverKey) {
+  if (!im.caKey) {
     if (error) *error = OpenSSLError("cannot make RSA keys");
     return nullptr;
   }
@@ -165,20 +167,40 @@ std::unique_ptr<Authority> Authority::Make(const std::string& organisation, cons
                    {{NID_basic_constraints, "critical,CA:TRUE"},
                     {NID_key_usage, "critical,keyCertSign,cRLSign"},
                     {NID_subject_key_identifier, "hash"}});
-  if (im.ca)
-    im.server = MakeCert(organisation, "localhost", im.serverKey.get(), im.ca.get(), im.caKey.get(), 730,
-                         {{NID_basic_constraints, "critical,CA:FALSE"},
-                          {NID_key_usage, "critical,digitalSignature,keyEncipherment"},
-                          {NID_ext_key_usage, "serverAuth"},
-                          {NID_subject_alt_name, "DNS:localhost,IP:127.0.0.1"},
-                          {NID_authority_key_identifier, "keyid"}});
-  if (!im.ca || !im.server) {
+  if (!im.ca) {
     if (error) *error = OpenSSLError("cannot make certificates");
     return nullptr;
   }
   im.caDER = ToDER(im.ca.get());
-  im.serverDER = ToDER(im.server.get());
+  im.organisation = organisation;
+  if (!authority->Reissue(leaf, error)) return nullptr;
   return authority;
+}
+
+bool Authority::Reissue(const LeafOptions& leaf, std::string* error) {
+  Impl& im = *m_impl;
+  PKey key(EVP_RSA_gen(static_cast<unsigned>(leaf.keyBits)));
+  PKey stray(leaf.forged ? EVP_RSA_gen(2048) : nullptr);
+  if (!key || (leaf.forged && !stray)) {
+    if (error) *error = OpenSSLError("cannot make RSA keys");
+    return false;
+  }
+  std::vector<std::pair<int, const char*>> extensions = {{NID_basic_constraints, "critical,CA:FALSE"},
+                                                         {NID_key_usage, "critical,digitalSignature,keyEncipherment"},
+                                                         {NID_ext_key_usage, "serverAuth"}};
+  if (!leaf.altNames.empty()) extensions.push_back({NID_subject_alt_name, leaf.altNames.c_str()});
+  if (!leaf.forged) extensions.push_back({NID_authority_key_identifier, "keyid"});
+  Cert server = MakeCert(im.organisation, leaf.commonName, key.get(), im.ca.get(),
+                         leaf.forged ? stray.get() : im.caKey.get(), leaf.validDays, extensions,
+                         EVP_get_digestbyname(leaf.digest.c_str()));
+  if (!server) {
+    if (error) *error = OpenSSLError("cannot make certificates");
+    return false;
+  }
+  im.server = std::move(server);
+  im.serverKey = std::move(key);
+  im.serverDER = ToDER(im.server.get());
+  return true;
 }
 
 const std::string& Authority::CaDER() const { return m_impl->caDER; }
@@ -233,20 +255,26 @@ struct Server::Impl {
     int fd;
     SSL* ssl = nullptr;
     Clock::time_point lastProgress = Clock::now();
+    const Clock::time_point deadline;
+    // The TLS session failed or the client went away: no close_notify then.
+    bool broken = false;
 
-    Connection(Impl& s, int f) : server(s), fd(f) {}
+    Connection(Impl& s, int f)
+        : server(s), fd(f), deadline(Clock::now() + std::chrono::seconds(std::max(1, s.options.requestSeconds))) {}
     ~Connection() {
       if (ssl) {
-        SSL_shutdown(ssl);
+        if (!broken) SSL_shutdown(ssl);
         SSL_free(ssl);
       }
       close(fd);
     }
 
-    // Waits for the socket; false when the server is done or the client idles too long.
+    // Waits for the socket; false when the server is done, the client idles
+    // too long or the connection's time is up.
     bool Wait(short events) {
       for (;;) {
-        if (server.Done() || Clock::now() - lastProgress > kIdleLimit) return false;
+        Clock::time_point now = Clock::now();
+        if (server.Done() || now - lastProgress > kIdleLimit || now >= deadline) return false;
         pollfd p{fd, events, 0};
         int n = poll(&p, 1, kSliceMs);
         if (n > 0) return true;
@@ -288,7 +316,10 @@ struct Server::Impl {
             lastProgress = Clock::now();
             return static_cast<size_t>(rc);
           }
-          if (!RetryTLS(rc)) return 0;
+          if (!RetryTLS(rc)) {
+            broken = true;
+            return 0;
+          }
         } else {
           ssize_t rc = recv(fd, buf, size, 0);
           if (rc > 0) {
@@ -311,6 +342,7 @@ struct Server::Impl {
             done += static_cast<size_t>(rc);
             lastProgress = Clock::now();
           } else if (!RetryTLS(rc)) {
+            broken = true;
             return false;
           }
         } else {
@@ -448,6 +480,14 @@ Server::~Server() { Stop(); }
 
 bool Server::Listen(std::string* error) {
   Impl& im = *m_impl;
+  // Writing to a client that hung up must fail with EPIPE, not end the process.
+  struct sigaction current {};
+  if (sigaction(SIGPIPE, nullptr, &current) == 0 && current.sa_handler == SIG_DFL) {
+    struct sigaction ignore {};
+    ignore.sa_handler = SIG_IGN;
+    sigemptyset(&ignore.sa_mask);
+    sigaction(SIGPIPE, &ignore, nullptr);
+  }
   auto fail = [&](const std::string& message) {
     if (error) *error = message;
     return false;
@@ -458,6 +498,10 @@ bool Server::Listen(std::string* error) {
     im.ctx = SSL_CTX_new(TLS_server_method());
     if (!im.ctx) return fail(OpenSSLError("cannot make a TLS context"));
     SSL_CTX_set_min_proto_version(im.ctx, TLS1_2_VERSION);
+    // Test equipment: the server offers whatever certificate it was given
+    // and leaves it to the client to judge whether it is strong enough.
+    SSL_CTX_set_security_level(im.ctx, 0);
+    if (im.options.tls12Only) SSL_CTX_set_max_proto_version(im.ctx, TLS1_2_VERSION);
     Authority::Impl* a = authority->impl();
     if (SSL_CTX_use_certificate(im.ctx, a->server.get()) != 1 ||
         SSL_CTX_use_PrivateKey(im.ctx, a->serverKey.get()) != 1 || SSL_CTX_check_private_key(im.ctx) != 1)

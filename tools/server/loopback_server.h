@@ -1,5 +1,7 @@
 // A small HTTP/1.1 server on the loopback interface, plain or over TLS, for
-// `ofxkit serve` and for the transport tests. It is not part of the library:
+// `ofxkit serve` and for the transport tests. Listening makes the process
+// ignore SIGPIPE (when nothing else handles it): a client that hangs up
+// must not end the server. It is not part of the library:
 // it is test and demonstration equipment, bounded in requests and in time.
 #pragma once
 
@@ -34,13 +36,30 @@ struct HttpResponse {
 
 using Handler = std::function<HttpResponse(const HttpRequest&)>;
 
+// What the server certificate of an authority looks like. The defaults make
+// a sound one; the others let tests show that a client refuses weak or
+// ill-named certificates.
+struct LeafOptions {
+  int keyBits = 2048;                                  // RSA key size
+  std::string digest = "SHA256";                       // signature digest: "SHA256", "SHA1", "MD5"
+  std::string commonName = "localhost";                // subject CN=
+  std::string altNames = "DNS:localhost,IP:127.0.0.1";  // subjectAltName; empty for none
+  // Signed by a stray key while naming the authority as its issuer.
+  bool forged = false;
+  // Valid from a day ago for this many days (0: expired a moment after it
+  // is made).
+  long validDays = 730;
+};
+
 // A certificate authority made in memory (RSA, SHA-256), and a server
-// certificate it issues for "localhost" and 127.0.0.1.
+// certificate it issues, by default for "localhost" and 127.0.0.1.
 class Authority {
  public:
   // organisation names the authority's subject O=; commonName its CN=.
   static std::unique_ptr<Authority> Make(const std::string& organisation, const std::string& commonName,
-                                         std::string* error);
+                                         std::string* error, const LeafOptions& leaf = LeafOptions());
+  // Replaces the server certificate (and its key) with one made as leaf asks.
+  bool Reissue(const LeafOptions& leaf, std::string* error);
   ~Authority();
   const std::string& CaDER() const;      // the authority's certificate, DER
   std::string CaPEM() const;
@@ -60,6 +79,12 @@ struct ServerOptions {
   int port = 0;                          // 0: any free port
   int maxRequests = 0;                   // stop after that many requests; 0: no bound
   int maxSeconds = 0;                    // stop after that long; 0: no bound
+  // Each connection, from its acceptance to its response, gets at most this
+  // long, however slowly its client trickles bytes in.
+  int requestSeconds = 30;
+  // TLS 1.2 at most (a key too small for TLS 1.3's signatures can still be
+  // offered that way).
+  bool tls12Only = false;
 };
 
 class Server {

@@ -27,6 +27,8 @@
 //   CHILD  an owned child aggregate; Get<Name>() and Set<Name>(Type*).
 //   ALSO   a further tag for the CHILD field <Name> declared before (an account
 //          that stands as "BANKACCTFROM" or "CCACCTFROM"); declares nothing.
+//   ALSOLIST  a further tag for the LIST field <Name> declared before: one
+//          list of children of several kinds, kept in read order.
 //   LIST   owned repeated children; GetNum<Name>(), Get<Name>(i),
 //          Set<Name>(i, Type*), Append<Name>(Type*), Clear<Name>().
 //   VALUES a repeated element of a VALUE type or an OEString type;
@@ -36,7 +38,8 @@
 // The description gives: .Valid(tags) in OFX order (the order of the
 // presence bits), .Required(tags), .WriteOrder(tags) when children and
 // elements are written in another order, .OneOf(a, b) for a pair of which at
-// most one may be present and one is expected. A class may inherit fields from
+// most one may be present and one is expected, .ExactlyOneOf(tags) for a
+// choice of which exactly one must be present. A class may inherit fields from
 // a family base; its valid tags choose which of them it uses.
 //
 // From that, OEAggregate supplies parsing (HandleTagElement, HandleTagStart),
@@ -179,7 +182,11 @@ struct OEChildCreator;
     static cls* Make(OEDataObjFactory* f, OETagID) { return f->creator(); }                \
   };
 #define OE_CREATOR_PLAIN(creator, type)
+// A family base made by the tag it stands under specialises OEChildCreator
+// itself (see OEAccount.h, OEMessageSetVersion.h).
+#define OE_CREATOR_FAMILY(creator, type)
 #include "ofxkit/core/OEFactoryCreators.def"
+#undef OE_CREATOR_FAMILY
 #undef OE_CREATOR_PLAIN
 #undef OE_CREATOR
 
@@ -208,6 +215,9 @@ struct OEFieldDesc {
   void (*reset)(OEAggregate* self);
   // Identifies the member, so that aliases share it.
   const void* member;
+  // Children that keep a link to the aggregate they stand for (see
+  // OEOwnedAggregate): links a child just made by `maker`; null for others.
+  void (*link)(OEDataObj* child, OEAggregate* maker, OETagID makerType);
 };
 
 // Everything the generic code knows of one class.
@@ -219,6 +229,9 @@ class OEAggregateInfo {
   OEAggregateInfo& Required(std::initializer_list<OETagID> tags);
   OEAggregateInfo& WriteOrder(std::initializer_list<OETagID> tags);
   OEAggregateInfo& OneOf(OETagID first, OETagID second);
+  // Exactly one of the tags must be present (a choice the aggregate cannot
+  // do without); the first is reported missing when none is.
+  OEAggregateInfo& ExactlyOneOf(std::initializer_list<OETagID> tags);
 
   // Fills in the per-position lookup; called once when the info is complete.
   const OEAggregateInfo& Finish();
@@ -233,6 +246,7 @@ class OEAggregateInfo {
     OETagID first, second;
   };
   std::vector<Pair> oneOf;
+  std::vector<std::vector<OETagID>> exactlyOne;
   // Per valid position: the field that takes the tag (null for none), and
   // whether that position writes the member (its first tag in write order).
   std::vector<const OEFieldDesc*> byPosition;
@@ -279,14 +293,54 @@ class OEAggregate : public OEDataObj {
   void LogFieldFault(OEParseWarning warning, OETagID tag, const OEString& text);
   // Clears a presence bit without the warning ClearTag gives for unknown tags.
   void ClearTagQuietly(OETagID tag);
+  // How many of the tags are present.
+  unsigned short PresentAmong(const std::vector<OETagID>& tags) const;
+  // The field that takes the tag in this class, or null.
+  const OEFieldDesc* FieldAt(OETagID tag) const;
 
  protected:
   // Deletes the children held by the fields this class declares itself.
   void DestroyOwnFields(const OEAggregateInfo& info);
 
- private:
-  const OEFieldDesc* FieldAt(OETagID tag) const;
 };
+
+// An inner aggregate that knows the outer aggregate it belongs to: the
+// INVTRAN inside a BUYSTOCK's INVBUY knows the BUYSTOCK and its tag. The link
+// is not an OFX field; it is neither owned, written nor compared.
+//
+// Whenever an aggregate makes such a child (while parsing, through a
+// creating getter, or in a deep copy), the child is linked: to the maker's
+// own owner when the maker is itself a linked inner aggregate, else to the
+// maker and the maker's type. A deep copy therefore links the copied
+// children to the copy, never to the source tree; copying an inner aggregate
+// on its own leaves its link as it was.
+class OEOwnedAggregate : public OEAggregate {
+ public:
+  OEDataObj* GetChildObj() const { return m_owner; }
+  void SetChildObj(OEDataObj* owner) { m_owner = owner; }
+  OETagID GetChildType() const { return m_ownerTag; }
+  void SetChildType(OETagID tag) { m_ownerTag = tag; }
+
+  // Links this aggregate to the one that made it, as described above.
+  void LinkToMaker(OEAggregate* maker, OETagID makerType);
+
+ private:
+  OEDataObj* m_owner = nullptr;
+  OETagID m_ownerTag = OE_TAG_NONE;
+};
+
+template <class T>
+void OELinkChild(OEDataObj* child, OEAggregate* maker, OETagID makerType) {
+  static_cast<T*>(child)->LinkToMaker(maker, makerType);
+}
+// The link function of a child class: null unless it is an owned aggregate.
+template <class T>
+constexpr void (*OELinkerOf())(OEDataObj*, OEAggregate*, OETagID) {
+  if constexpr (std::is_base_of<OEOwnedAggregate, T>::value)
+    return &OELinkChild<T>;
+  else
+    return nullptr;
+}
 
 // ---------------------------------------------------------------------------
 // Setter bodies shared by the generated accessors.
@@ -345,6 +399,25 @@ unsigned short OESetChildField(OEAggregate* self, T*& field, T* child) {
   if (field || !child) return 0;
   field = child;
   return self->SetTag(child->GetType());
+}
+
+// The single child, made through the factory (with the tag as its type, and
+// linked as a parse would link it) when there is none and `create` is set.
+template <class T>
+T* OEGetOrMakeChild(OEAggregate* self, T*& field, unsigned short create, OETagID tag) {
+  if (field || !create) return field;
+  OEDataObjFactory* factory = OEDataObj::GetFactory();
+  if (!factory) return nullptr;
+  T* child = OEChildCreator<T>::Make(factory, tag);
+  if (!child) {
+    g_allocFailed = 1;
+    return nullptr;
+  }
+  child->SetType(tag);
+  if (auto link = OELinkerOf<T>()) link(child, self, self->GetType());
+  field = child;
+  self->SetTag(tag);
+  return child;
 }
 
 // A repeated child at i (i = count appends); its type's tag is marked present.
@@ -514,6 +587,7 @@ struct OEValuesOps {
 #define OE_DECLARE_CHILD(Name, TAG, Type)                                \
  public:                                                                 \
   Type* Get##Name() const { return m_##Name; }                           \
+  Type* Get##Name(unsigned short create) { return OEGetOrMakeChild(this, m_##Name, create, OE_TAG_##TAG); } \
   unsigned short Set##Name(Type* child) { return OESetChildField(this, m_##Name, child); } \
                                                                          \
  protected:                                                              \
@@ -531,6 +605,9 @@ struct OEValuesOps {
                                                                                                   \
  protected:                                                                                       \
   OEDynamicArrayTyped<Type> m_##Name;
+
+// ALSOLIST: a further tag for the LIST field Name declared before.
+#define OE_DECLARE_ALSOLIST(Name, TAG, Type)
 
 #define OE_DECLARE_VALUES(Name, TAG, Type)                                                        \
  public:                                                                                          \
@@ -579,7 +656,7 @@ struct OEValuesOps {
               &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Write,                      \
               &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Copy,                       \
               &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Text,                       \
-              nullptr, nullptr, nullptr, nullptr, nullptr, #Name},
+              nullptr, nullptr, nullptr, nullptr, nullptr, #Name, nullptr},
 #define OE_DESC_TEXT(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OETextTraits)
 #define OE_DESC_VALUE(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OEValueTraits<Type>)
 #define OE_DESC_FLAG(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, unsigned short, OEFlagTraits)
@@ -589,7 +666,7 @@ struct OEValuesOps {
               &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
               &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
               &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                  \
-              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
 #define OE_DESC_CHILD(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, false)
 #define OE_DESC_ALSO(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, true)
 #define OE_DESC_LIST(Name, TAG, Type)                                                                    \
@@ -598,7 +675,14 @@ struct OEValuesOps {
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
+#define OE_DESC_ALSOLIST(Name, TAG, Type)                                                                \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, true, nullptr, nullptr, nullptr, nullptr,                    \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                   \
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
 #define OE_DESC_VALUES(Name, TAG, Type)                                                                  \
   OEFieldDesc{OE_TAG_##TAG, OE_FIELD_VALUES, false,                                                     \
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::SetText,        \
@@ -606,7 +690,7 @@ struct OEValuesOps {
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Copy,           \
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Text, nullptr,  \
               &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Count,          \
-              nullptr, nullptr, nullptr, #Name},
+              nullptr, nullptr, nullptr, #Name, nullptr},
 
 // Defines construction (setting the default type), destruction and the class
 // description. DESCRIPTION continues the description: .Valid(...) and so on.

@@ -82,17 +82,7 @@ struct OEPlainStore {
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
               &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
               &OEWrapperListPut<ThisClass, Type, &ThisClass::m_##Name>,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
-
-// ALSOLIST: a further tag for the LIST field Name declared before.
-#define OE_DECLARE_ALSOLIST(Name, TAG, Type)
-#define OE_DESC_ALSOLIST(Name, TAG, Type)                                                               \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, true, nullptr, nullptr, nullptr, nullptr,                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                               \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                  \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name},
+              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, nullptr},
 
 // ---------------------------------------------------------------------------
 

@@ -16,6 +16,9 @@
 // written by OEBuilder::Build.
 #pragma once
 
+#include <string>
+#include <unordered_map>
+
 #include <type_traits>
 
 #include "ofxkit/core/OEDataObj.h"
@@ -181,6 +184,10 @@ class OEFile : public OEDataObj, public OEHeaderValidation {
   OEDynamicArraySubfile m_subfiles;
   // Values of OFXHEADER..NEWFILEUID; an empty string means not given.
   OEString m_headers[kLastHeader - kFirstHeader + 1];
+  // MIME header positions by upper-cased name, so that a long header block
+  // is read in linear time; the first m_mimeIndexed headers are in it.
+  mutable std::unordered_map<std::string, unsigned short> m_mimeIndex;
+  mutable unsigned short m_mimeIndexed = 0;
 };
 
 // A file with an OFX header block: writes it with defaults for the headers
@@ -199,6 +206,11 @@ class OEFileOFX : public OEFile {
   // Logs every missing or unexpected header; 0 only for an unknown DATA,
   // ENCODING or COMPRESSION value.
   unsigned short ValidateHeaders() const override;
+  // Also accepts "ENCODING:UTF-8" and "ENCODING:UNICODE" (with the warning a
+  // wrong value gets), which real servers send.
+  unsigned short ValidateHeadersTolerantly() const override;
+ private:
+  unsigned short CheckHeaders(bool tolerant) const;
 };
 
 // What request and response files share: one Item per OFX aggregate of the

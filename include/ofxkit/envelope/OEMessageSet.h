@@ -6,6 +6,7 @@
 
 #include "ofxkit/envelope/OESignOn.h"
 #include "ofxkit/envelope/OETransWrapper.h"
+#include "ofxkit/messages/invest/OESecurities.h"
 
 // What the request and response sets share (Set is the class itself,
 // Response tells the side).
@@ -50,26 +51,11 @@ class OEMessageSetRq : public OEMessageSetBase<OEMessageSetRq, false> {
   static OETagID MsgIDToMsgSetID(OETagID inner);
 };
 
-// Stands for the securities list ("SECLIST") of a securities-list response
-// set until the list has a class of its own: it takes the list's place and
-// reads past its content (the parser logs each child aggregate as
-// OEPW_INVALIDAGG and skips it).
-class OESecListPlaceholder : public OEAggregate {
- public:
-  OESecListPlaceholder() { SetType(OE_TAG_SECLIST); }
-  // No valid tags (an empty array, not a missing one): nothing inside is read.
-  unsigned short GetArrayOfValidTags(OEArrayOfTags& tags) const override;
-};
-template <>
-struct OEChildCreator<OESecListPlaceholder> {
-  static OESecListPlaceholder* Make(OEDataObjFactory*, OETagID);
-};
-
 #define OE_MESSAGESETRS_FIELDS(X)                  \
   X(CHILD, SignOnRs, SONRS, OESignOnRs)            \
   X(WRAPPERS, Trans, NONE, OETransRs)              \
   X(WRAPPERS, Sync, NONE, OESyncRs)                \
-  X(CHILD, SecList, SECLIST, OESecListPlaceholder)
+  X(CHILD, SecList, SECLIST, OESecList)
 
 class OEMessageSetRs : public OEMessageSetBase<OEMessageSetRs, true> {
   OE_AGGREGATE_BY_TYPE(OEMessageSetRs, OE_MESSAGESETRS_FIELDS)

@@ -93,6 +93,8 @@ class GXNNetRequest : public OENetRequest {
   unsigned short AddTrustedRootBER(const char* data, unsigned short length, OECallbackRootID id) override;
   unsigned short AddExpectedSSLCertID(const char* id, unsigned short length) override;
   unsigned short AddExpectedSSLCertName(const OEString& name) override;
+  // 0 skips only the validity dates and the host name of the server's
+  // certificate; its chain must still verify up to a trusted root.
   unsigned short SetSSLVerifyCert(unsigned short verify) override;
   OENetStatus Get(const OEString& url) override;
   OENetStatus Send(const OEString& url, OEBuffer* body) override;

@@ -27,6 +27,7 @@ enum GXError : uint16_t {
   GX_ERR_CANCELLED = 1530,          // NCCancel, or the session closed
   GX_ERR_CANNOT_CONNECT = 1531,     // the host cannot be resolved or reached
   GX_ERR_TEMP_FILE = 1540,          // a temporary file cannot be made
+  GX_ERR_REPLY_TOO_LARGE = 1541,    // the reply is larger than a buffer can hold
   GX_ERR_BAD_URL = 1547,            // not an http: or https: URL, or malformed
   GX_ERR_CONNECTION_LOST = 1548,    // the connection failed during the transfer
   GX_ERR_BAD_ARGUMENT = 1549,       // unknown session or handle, missing argument
@@ -36,6 +37,7 @@ enum GXError : uint16_t {
   GX_ERR_CERT_ROOT_REFUSED = 1671,  // the chain's root is not accepted
   GX_ERR_CERT_EXPIRED = 1672,       // a certificate is expired or not yet valid
   GX_ERR_CERT_NAME = 1673,          // the certificate does not name the host
+  GX_ERR_CERT_WEAK = 1674,          // a key or signature digest is too weak
   GX_ERR_OTHER = 1699
 };
 
@@ -97,10 +99,12 @@ NCHandle NCGetFileRequest(uint16_t* error, NCSession session, const char* url, c
 // transfer, in seconds.
 uint16_t NCSetHTTPInfo(NCHandle handle, int32_t reserved1, int32_t setContentType, const char* contentType,
                        int32_t reserved2, int32_t reserved3, int32_t timeout);
-// SSL settings: noVerify 0 verifies the server's chain against the system's
-// and the added roots and its name against the URL's host; 1 passes every
-// chain to the callback with error 0. handshakeSeconds bounds the time to
-// connect and shake hands.
+// SSL settings: noVerify 0 verifies the server's chain against the added
+// roots (the system's when none are added), its name against the URL's host,
+// and its keys and signatures against the connection's security level (at
+// least 2); 1 skips only the validity dates and the host name. A chain that
+// does not verify reaches the callback with its error and root id 0.
+// handshakeSeconds bounds the time to connect and shake hands.
 uint16_t NCSetSSLInfo(NCHandle handle, int32_t noVerify, GXCertificateCallback callback, int32_t handshakeSeconds);
 uint16_t NCInitiate(NCSession session, NCHandle handle);
 // Cancels a transfer; its finished record (GX_ERR_CANCELLED) is delivered

@@ -81,6 +81,9 @@ class OEParseEngine {
   void ResetToEndOfHeader();
 
   // ---- Header block and MIME
+  // Moves the header position past blank lines (whitespace up to a line end);
+  // answers how many line ends were passed.
+  uint32_t SkipBlankLines();
   // Reads the next header line: 1 with tag (OE_HEADER_UNKNOWN for a name that
   // is not an OFX header; that is logged), value and, when name is given, the
   // raw name; 0 when the header block has ended (blank line, or the body

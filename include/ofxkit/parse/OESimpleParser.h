@@ -2,6 +2,8 @@
 // time to the current object, with the recovery rules of the library.
 #pragma once
 
+#include <cstdint>
+
 #include "ofxkit/parse/OEParser.h"
 
 class OEParseEngine;
@@ -13,10 +15,28 @@ class OEHeaderValidation {
  public:
   virtual ~OEHeaderValidation() = default;
   virtual unsigned short ValidateHeaders() const = 0;
+  // The same for a tolerant reading (OE_READ_TOLERANT): values that real
+  // servers send are accepted with a warning instead of refusing the file.
+  virtual unsigned short ValidateHeadersTolerantly() const { return ValidateHeaders(); }
+};
+
+// Reading options of a parse (SetReadingOptions), OR-ed together.
+enum OEReadingOption : uint32_t {
+  // The recovery rules of the library and nothing more (the default).
+  OE_READ_STRICT = 0,
+  // What servers commonly send beside the OFX 1.x rules is read, each time
+  // with a warning (so such a parse answers 7, never 0): blank lines before
+  // the header block are passed over; "ENCODING:UTF-8" (or "UNICODE") does not
+  // refuse the file; an element tag directly followed by another tag
+  // ("<MEMO><NAME>x") is read as an empty element instead of ending the parse.
+  OE_READ_TOLERANT = 1
 };
 
 class OESimpleParser : public OEParser {
  public:
+  // Header lines kept from one file; the rest are read past with a warning.
+  static constexpr uint32_t kMaxHeaderLines = 1000;
+
   OESimpleParser();
 
   // Parses buffer into root. Answers 0 for a clean parse, 7 when the text was
@@ -33,6 +53,9 @@ class OESimpleParser : public OEParser {
     m_engine = engine;
     return 1;
   }
+  // OE_READ_STRICT (the default) or OE_READ_TOLERANT, for the next parses.
+  void SetReadingOptions(uint32_t options) { m_options = options; }
+  uint32_t GetReadingOptions() const { return m_options; }
 
  private:
   OEParseStatus ReadHeaders(OEParseEngine& engine, OEDataObj* root);
@@ -40,5 +63,8 @@ class OESimpleParser : public OEParser {
   unsigned short LogRecord(OEParseWarning warning, const OEString& value, const char* tagName, OETagID tag);
 
   OEParseEngine* m_engine;
+  bool ReadEmptyElement(const OETagDictionaryEntry& entry);
+
   OEDataObj* m_objectWithError;
+  uint32_t m_options = OE_READ_STRICT;
 };

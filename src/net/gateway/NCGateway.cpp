@@ -4,9 +4,12 @@
 // certificate callback before the handshake may finish.
 #include "ofxkit/net/NCGateway.h"
 
+#include "ofxkit/types/OEBuffer.h"
+
 #include <arpa/inet.h>
 #include <curl/curl.h>
 #include <fcntl.h>
+#include <openssl/crypto.h>
 #include <openssl/ssl.h>
 #include <openssl/x509.h>
 #include <openssl/x509_vfy.h>
@@ -62,12 +65,16 @@ struct Transfer {
   std::FILE* header = nullptr;
   std::string replyPath, headerPath;
   bool started = false;
+  bool tooLarge = false;
+  curl_off_t written = 0;
   uint16_t certVerdict = 0;
   curl_off_t sent = 0, toSend = 0, received = 0, toReceive = 0;
   curl_off_t sentReported = 0, receivedReported = 0;  // nothing to report until bytes move
 
   ~Transfer() {
     if (easy) curl_easy_cleanup(easy);
+    // A request body usually holds the user's password.
+    if (!body.empty()) OPENSSL_cleanse(&body[0], body.size());
     curl_slist_free_all(headers);
     if (reply) std::fclose(reply);
     if (header) std::fclose(header);
@@ -151,6 +158,8 @@ uint16_t ErrorForCurlResult(CURLcode result) {
       return GX_ERR_CANNOT_CONNECT;
     case CURLE_OPERATION_TIMEDOUT:
       return 1517;  // as HTTP 408
+    case CURLE_FILESIZE_EXCEEDED:
+      return GX_ERR_REPLY_TOO_LARGE;
     case CURLE_UNSUPPORTED_PROTOCOL:
     case CURLE_URL_MALFORMAT:
       return GX_ERR_BAD_URL;
@@ -174,9 +183,19 @@ uint16_t ErrorForCurlResult(CURLcode result) {
 
 // ---- Callbacks from libcurl -------------------------------------------
 
+// A reply that no buffer of the library could hold is refused while it
+// arrives, not after it has filled the disk.
+constexpr curl_off_t kMaxReplyBytes = OEBuffer::kMaxBufferSize - 1;
+
 size_t WriteBody(char* data, size_t size, size_t count, void* user) {
   Transfer* t = static_cast<Transfer*>(user);
-  return std::fwrite(data, size, count, t->reply) * size;
+  size_t n = size * count;
+  if (t->written + static_cast<curl_off_t>(n) > kMaxReplyBytes) {
+    t->tooLarge = true;
+    return 0;
+  }
+  t->written += static_cast<curl_off_t>(n);
+  return std::fwrite(data, 1, n, t->reply);
 }
 
 // Keeps the header lines of the last response only (a "100 Continue" comes
@@ -235,10 +254,18 @@ uint16_t ErrorForVerification(int x509Error) {
     case X509_V_ERR_HOSTNAME_MISMATCH:
     case X509_V_ERR_IP_ADDRESS_MISMATCH:
       return GX_ERR_CERT_NAME;
+    case X509_V_ERR_EE_KEY_TOO_SMALL:
+    case X509_V_ERR_CA_KEY_TOO_SMALL:
+    case X509_V_ERR_CA_MD_TOO_WEAK:
+      return GX_ERR_CERT_WEAK;
     default:
       return GX_ERR_CERT_UNTRUSTED;
   }
 }
+
+// Certificates are judged at the connection's security level, and never
+// below level 2 (keys of at least 2048 bits, no MD5 or SHA-1 signatures).
+constexpr int kMinSecurityLevel = 2;
 
 struct StoreCtxDeleter {
   void operator()(X509_STORE_CTX* c) const { X509_STORE_CTX_free(c); }
@@ -250,33 +277,49 @@ struct ChainDeleter {
   void operator()(STACK_OF(X509) * s) const { sk_X509_pop_free(s, X509_free); }
 };
 
+// Host name rules as strict as curl's: no partial wildcards ("b*.example"),
+// and the subject's common name only for a certificate without any
+// alternative name.
+void SetHost(X509_VERIFY_PARAM* param, X509* leaf, const std::string& host) {
+  if (host.empty()) return;
+  unsigned int flags = X509_CHECK_FLAG_NO_PARTIAL_WILDCARDS;
+  if (X509_get_ext_by_NID(leaf, NID_subject_alt_name, -1) >= 0) flags |= X509_CHECK_FLAG_NEVER_CHECK_SUBJECT;
+  X509_VERIFY_PARAM_set_hostflags(param, flags);
+  if (IsIPAddress(host))
+    X509_VERIFY_PARAM_set1_ip_asc(param, host.c_str());
+  else
+    X509_VERIFY_PARAM_set1_host(param, host.c_str(), host.size());
+}
+
 // Verifies the server's chain against the system's roots and the
 // transfer's own, then asks the transfer's certificate callback. The root id
-// is that of the first certificate up the chain that was added as a trusted
-// root, so a chain through an added intermediate authority is known by it.
-uint16_t JudgeChain(Transfer* t, X509* leaf, STACK_OF(X509) * sent) {
+// is that of the first certificate up the verified chain that was added as a
+// trusted root, so a chain through an added intermediate authority is known
+// by it. With verification off only the validity dates and the host name go
+// unchecked: signatures, key sizes and the path to a root still count, and a
+// chain that fails them has no root id.
+uint16_t JudgeChain(Transfer* t, X509* leaf, STACK_OF(X509) * sent, int securityLevel) {
   std::unique_ptr<X509_STORE, StoreDeleter> store(X509_STORE_new());
   std::unique_ptr<X509_STORE_CTX, StoreCtxDeleter> vctx(X509_STORE_CTX_new());
   if (!store || !vctx || !leaf) return GX_ERR_CERT_UNTRUSTED;
-  X509_STORE_set_default_paths(store.get());
+  // The system's roots count only when the transfer adds none of its own.
+  if (t->roots.empty()) X509_STORE_set_default_paths(store.get());
   for (const TrustedRoot& root : t->roots) X509_STORE_add_cert(store.get(), root.cert);
   if (!X509_STORE_CTX_init(vctx.get(), store.get(), leaf, sent)) return GX_ERR_CERT_UNTRUSTED;
   X509_STORE_CTX_set_purpose(vctx.get(), X509_PURPOSE_SSL_SERVER);
   X509_VERIFY_PARAM* param = X509_STORE_CTX_get0_param(vctx.get());
   X509_VERIFY_PARAM_set_flags(param, X509_V_FLAG_PARTIAL_CHAIN);
-  std::string host = HostOf(t->url);
-  if (!host.empty()) {
-    if (IsIPAddress(host))
-      X509_VERIFY_PARAM_set1_ip_asc(param, host.c_str());
-    else
-      X509_VERIFY_PARAM_set1_host(param, host.c_str(), host.size());
-  }
+  X509_VERIFY_PARAM_set_auth_level(param, std::max(securityLevel, kMinSecurityLevel));
+  if (t->noVerify)
+    X509_VERIFY_PARAM_set_flags(param, X509_V_FLAG_NO_CHECK_TIME);
+  else
+    SetHost(param, leaf, HostOf(t->url));
   int verified = X509_verify_cert(vctx.get());
   uint16_t error = verified == 1 ? static_cast<uint16_t>(GX_OK) : ErrorForVerification(X509_STORE_CTX_get_error(vctx.get()));
-  if (t->noVerify) error = GX_OK;
 
-  // The chain as built (as far as it got), else as the server sent it.
-  std::unique_ptr<STACK_OF(X509), ChainDeleter> chain(X509_STORE_CTX_get1_chain(vctx.get()));
+  // The chain as built when it verified, else the server's certificate alone.
+  std::unique_ptr<STACK_OF(X509), ChainDeleter> chain(verified == 1 ? X509_STORE_CTX_get1_chain(vctx.get())
+                                                                    : nullptr);
   if (!chain || sk_X509_num(chain.get()) == 0) {
     chain.reset(sk_X509_new_null());
     if (!chain) return GX_ERR_CERT_UNTRUSTED;
@@ -285,7 +328,7 @@ uint16_t JudgeChain(Transfer* t, X509* leaf, STACK_OF(X509) * sent) {
   }
   uint32_t rootID = 0;
   int count = sk_X509_num(chain.get());
-  for (int i = 0; i < count && !rootID; ++i) {
+  for (int i = 0; verified == 1 && i < count && !rootID; ++i) {
     X509* c = sk_X509_value(chain.get(), i);
     for (const TrustedRoot& root : t->roots)
       if (X509_cmp(c, root.cert) == 0) {
@@ -316,7 +359,9 @@ uint16_t JudgeChain(Transfer* t, X509* leaf, STACK_OF(X509) * sent) {
 
 int VerifyServer(X509_STORE_CTX* sctx, void* arg) {
   Transfer* t = FindTransfer(static_cast<NCHandle>(reinterpret_cast<uintptr_t>(arg)));
-  uint16_t verdict = t ? JudgeChain(t, X509_STORE_CTX_get0_cert(sctx), X509_STORE_CTX_get0_untrusted(sctx))
+  SSL* ssl = static_cast<SSL*>(X509_STORE_CTX_get_ex_data(sctx, SSL_get_ex_data_X509_STORE_CTX_idx()));
+  int level = ssl ? SSL_get_security_level(ssl) : kMinSecurityLevel;
+  uint16_t verdict = t ? JudgeChain(t, X509_STORE_CTX_get0_cert(sctx), X509_STORE_CTX_get0_untrusted(sctx), level)
                        : static_cast<uint16_t>(GX_ERR_CERT_UNTRUSTED);
   if (verdict) {
     if (t) t->certVerdict = verdict;
@@ -431,6 +476,7 @@ void CollectFinished(NCSessionData* session) {
     std::unique_ptr<Transfer> t = TakeTransfer(static_cast<NCHandle>(reinterpret_cast<uintptr_t>(priv)));
     if (!t) continue;
     uint16_t error = t->certVerdict;
+    if (!error && t->tooLarge) error = GX_ERR_REPLY_TOO_LARGE;
     if (!error) error = ErrorForCurlResult(result);
     if (!error) {
       long status = 0;
@@ -519,6 +565,7 @@ bool ConfigureEasy(Transfer* t) {
   set(curl_easy_setopt(e, CURLOPT_SSL_CTX_FUNCTION, SetUpSSL));
   set(curl_easy_setopt(e, CURLOPT_SSL_CTX_DATA, reinterpret_cast<void*>(static_cast<uintptr_t>(t->handle))));
   if (t->timeout > 0) set(curl_easy_setopt(e, CURLOPT_TIMEOUT, static_cast<long>(t->timeout)));
+  set(curl_easy_setopt(e, CURLOPT_MAXFILESIZE_LARGE, kMaxReplyBytes));
   if (t->handshakeSeconds > 0)
     set(curl_easy_setopt(e, CURLOPT_CONNECTTIMEOUT, static_cast<long>(t->handshakeSeconds)));
   if (t->post) {

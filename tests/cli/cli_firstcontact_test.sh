@@ -1,0 +1,70 @@
+#!/usr/bin/env bash
+# First contact with the tool alone, over HTTPS against `ofxkit serve` on the
+# loopback interface: the profile, the accounts, then a statement of each
+# account; and the profile and accounts commands on files of other shapes.
+set -u
+ofxkit="$1"
+corpus="$2"
+work=$(mktemp -d)
+server=
+cleanup() {
+  [ -n "$server" ] && kill "$server" 2> /dev/null && wait "$server" 2> /dev/null
+  rm -rf "$work"
+}
+trap cleanup EXIT
+failures=0
+check() {  # check DESCRIPTION EXPECTED ACTUAL
+  if [ "$2" = "$3" ]; then echo "ok   $1"; else echo "FAIL $1: expected '$2', got '$3'"; failures=$((failures + 1)); fi
+}
+
+for cmd in profile accounts "request profile" "request accounts"; do
+  $ofxkit $cmd --help | grep -q usage; check "help of $cmd" 0 $?
+done
+echo pw | $ofxkit request accounts --org X --user a --password-stdin --since 2026-01-01 > /dev/null 2>&1
+check "a bad --since is refused" 64 $?
+
+echo "s3cret" | $ofxkit serve --https --cert-out "$work/ca.der" --ready-file "$work/url" --user alice \
+  --password-stdin --transactions 5 --max-requests 8 --max-seconds 60 > /dev/null 2> "$work/server.log" &
+server=$!
+for _ in $(seq 300); do [ -s "$work/url" ] && break; sleep 0.1; done
+url=$(cat "$work/url")
+post() {  # post NAME: exchange NAME-rq.ofx into NAME-rs.ofx
+  $ofxkit exchange "$work/$1-rq.ofx" "$url" --trust "$work/ca.der" --quiet -o "$work/$1-rs.ofx" > /dev/null 2>&1
+}
+signon=(--org Demo --fid 1 --user alice --password-stdin)
+echo "s3cret" | $ofxkit request profile "${signon[@]}" -o "$work/profile-rq.ofx" 2> /dev/null
+post profile; check "profile exchanged" 0 $?
+$ofxkit profile "$work/profile-rs.ofx" > "$work/profile.txt"; check "profile read" 0 $?
+check "every served message set listed" 7 "$(grep -c 'MSGSETV1 *version 1' "$work/profile.txt")"
+check "the realm's rules" 1 "$(grep -c 'DEMO: password of 6 to 32 characters' "$work/profile.txt")"
+echo "s3cret" | $ofxkit request accounts "${signon[@]}" -o "$work/accounts-rq.ofx" 2> /dev/null
+post accounts; check "accounts exchanged" 0 $?
+$ofxkit accounts "$work/accounts-rs.ofx" > "$work/accounts.csv"; check "accounts read" 0 $?
+check "four accounts of three kinds" "BANK BANK CARD INVESTMENT " "$(tail -n +2 "$work/accounts.csv" | cut -d, -f1 | tr '\n' ' ')"
+statements=0
+while IFS=, read -r kind bankid acctid type _; do
+  case "$kind" in
+    BANK) options=(--bank-id "$bankid" --type "$type") ;;
+    CARD) options=(--type CARD) ;;
+    INVESTMENT) options=(--type INVESTMENT --broker-id "$bankid") ;;
+  esac
+  echo "s3cret" | $ofxkit request statement "${signon[@]}" --account "$acctid" "${options[@]}" \
+    -o "$work/$acctid-rq.ofx" 2> /dev/null
+  post "$acctid" && [ "$($ofxkit statement "$work/$acctid-rs.ofx" | wc -l)" -eq 6 ] && statements=$((statements + 1))
+done < <(tail -n +2 "$work/accounts.csv")
+check "a statement of five transactions for each account" 4 "$statements"
+echo "wrong" | $ofxkit request accounts --org Demo --user alice --password-stdin -o "$work/denied-rq.ofx" 2> /dev/null
+post denied
+check "a wrong password gets 15500 and no accounts" "1 0" \
+  "$(grep -c '<CODE>15500' "$work/denied-rs.ofx") $(grep -c '<ACCTINFORS>' "$work/denied-rs.ofx")"
+
+if [ -f "$corpus/acctinfo-response.ofx" ]; then
+  $ofxkit accounts "$corpus/acctinfo-response.ofx" > "$work/sample.csv" 2> /dev/null
+  check "sample account list" "BANK,1234567789,12345,CHECKING,Power Checking,ACTIVE,download xfersrc xferdest" \
+    "$(sed -n 2p "$work/sample.csv")"
+fi
+$ofxkit profile "$work/accounts-rs.ofx" > /dev/null 2> "$work/none"
+check "no profile in an account list is said" 1 "$(grep -c 'no profile response' "$work/none")"
+
+echo "$failures failure(s)"
+[ "$failures" -eq 0 ]

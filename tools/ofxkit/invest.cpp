@@ -1,0 +1,261 @@
+// Brokerage data of the ofxkit tool: investment transactions (as part of
+// `statement`), positions and balances (`positions`).
+#include <algorithm>
+#include <cstdio>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "cli.h"
+
+namespace cli {
+namespace {
+
+const char kPositionsHelp[] =
+    "usage: ofxkit positions [--balances] [--account] [--raw] [--strict] FILE\n"
+    "Prints the positions of every investment statement of an OFX response file\n"
+    "as CSV: security,name,kind,units,unitprice,mktval,priceasof,postype,heldinacct\n"
+    "(security is the ticker when the file's security list names one, else the\n"
+    "security id). With --balances, prints the cash, margin and short balances\n"
+    "and the balance list instead: name,value,type,description,asof.\n"
+    "With --account, a first column names the account (broker:account).\n"
+    "--raw and --strict as for 'ofxkit statement'. Positions of the file that\n"
+    "could not be read are reported on standard error, and the exit status is\n"
+    "then never 0. Exit status as for 'ofxkit dump'.\n";
+
+// The present element `tag` of an aggregate as OFX text; empty when absent.
+std::string ElementText(const OEDataObj* obj, OETagID tag) {
+  const auto* agg = dynamic_cast<const OEAggregate*>(obj);
+  if (!agg || !agg->ValidateTag(tag)) return "";
+  const OEAggregateInfo& info = agg->GetInfo();
+  OEString text;
+  for (size_t i = 0; i < info.writeList.size(); ++i)
+    if (info.writeTags[i] == tag && info.writeList[i]->text && info.writeList[i]->text(agg, 0, text))
+      return text.c_str();
+  return "";
+}
+
+// A child of the given type, or null.
+const OEDataObj* ChildOfType(const OEDataObj* obj, OETagID type) {
+  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i) {
+    const OEDataObj* child = obj->GetChild(i);
+    if (child && child->GetType() == type) return child;
+  }
+  return nullptr;
+}
+
+// The body of a transaction kind that holds its common fields: its INVBUY
+// or INVSELL, else the kind itself.
+const OEDataObj* TransactionBody(const OEDataObj* kind) {
+  if (const OEDataObj* buy = ChildOfType(kind, OE_TAG_INVBUY)) return buy;
+  if (const OEDataObj* sell = ChildOfType(kind, OE_TAG_INVSELL)) return sell;
+  return kind;
+}
+
+// An element of a kind or of its body.
+std::string KindText(const OEDataObj* kind, const OEDataObj* body, OETagID tag) {
+  std::string text = ElementText(body, tag);
+  return text.empty() && body != kind ? ElementText(kind, tag) : text;
+}
+
+std::string IsoDate(const OEDateTime& d) {
+  char text[24];
+  std::snprintf(text, sizeof text, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
+  return text;
+}
+
+// The securities that the file's security lists describe, by id.
+class Securities {
+ public:
+  explicit Securities(const OEDataObj* root) { Collect(root); }
+
+  // "ticker" (or the id when no ticker is known) and the security's name.
+  void Describe(const OESecID* id, std::string& security, std::string& name) const {
+    security.clear();
+    name.clear();
+    if (!id) return;
+    auto found = m_byId.find(Key(*id));
+    if (found != m_byId.end()) {
+      security = found->second.first;
+      name = found->second.second;
+    }
+    if (security.empty()) security = std::string(id->GetUniqueIDType().c_str()) + ":" + id->GetUniqueID().c_str();
+  }
+
+ private:
+  static std::string Key(const OESecID& id) {
+    return std::string(id.GetUniqueIDType().c_str()) + ":" + id.GetUniqueID().c_str();
+  }
+  void Collect(const OEDataObj* obj) {
+    if (const auto* set = dynamic_cast<const OEMessageSetRs*>(obj)) {
+      if (const OESecList* list = set->GetSecList()) Add(*list);
+      return;
+    }
+    for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
+      if (const OEDataObj* child = obj->GetChild(i)) Collect(child);
+  }
+  void Add(const OESecList& list) {
+    for (unsigned short i = 0, n = list.GetNumberOfChildren(); i < n; ++i) {
+      const OEDataObj* kind = list.GetChild(i);
+      const auto* info = kind ? dynamic_cast<const OESecInfo*>(ChildOfType(kind, OE_TAG_SECINFO)) : nullptr;
+      if (!info || !info->GetSecID()) continue;
+      m_byId[Key(*info->GetSecID())] = {info->GetTicker().c_str(), info->GetSecName().c_str()};
+    }
+  }
+  std::map<std::string, std::pair<std::string, std::string>> m_byId;
+};
+
+// Investment statement responses anywhere in the tree, in document order.
+void CollectInvStatements(OEDataObj* obj, std::vector<OEInvStmtRs*>& out) {
+  if (auto* rs = dynamic_cast<OEInvStmtRs*>(obj)) {
+    out.push_back(rs);
+    return;
+  }
+  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
+    if (OEDataObj* child = obj->GetChild(i)) CollectInvStatements(child, out);
+}
+
+std::string InvAccountName(const OEInvStmtRs& rs) {
+  const OEInvAcctFrom* account = rs.GetInvAcctFrom();
+  if (!account) return "";
+  return std::string(account->GetBrokerID().c_str()) + ":" + account->GetAccountID().c_str();
+}
+
+struct Row {
+  const OEInvTran* tran;
+  std::string text;  // the CSV line after the date
+};
+
+}  // namespace
+
+bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bool separate) {
+  std::vector<OEInvStmtRs*> statements;
+  CollectInvStatements(root, statements);
+  if (statements.empty()) return false;
+  Securities securities(root);
+  if (separate) std::printf("\n");
+  std::printf(
+      "%sdate,kind,security,name,units,unitprice,commission,total,subacctsec,subacctfund,subacctfrom,subacctto,"
+      "fitid,memo\n",
+      withAccount ? "account," : "");
+  for (OEInvStmtRs* rs : statements) {
+    OEInvTranList* list = rs->GetInvTranList();
+    if (!list) continue;
+    list->BuildGenericInvTranList();  // fills the bank transactions' INVTRAN
+    std::string account = withAccount ? CsvText(InvAccountName(*rs).c_str(), raw) + "," : "";
+    std::vector<Row> rows;
+    for (unsigned short i = 0, n = list->GetNumberOfChildren(); i < n; ++i) {
+      OEDataObj* kind = list->GetChild(i);
+      if (!kind) continue;
+      const OEDataObj* body = TransactionBody(kind);
+      const OEInvTran* tran = dynamic_cast<const OEInvTran*>(ChildOfType(body, OE_TAG_INVTRAN));
+      const OEDataObj* amounts = body;
+      if (auto* bank = dynamic_cast<OEInvBankTran*>(kind)) {
+        tran = bank->GetInvTran();
+        amounts = bank->GetStatementTx();
+      }
+      std::string security, name;
+      securities.Describe(dynamic_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), security, name);
+      std::string total = amounts ? ElementText(amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT) : "";
+      std::string line = CsvText(TagName(kind->GetType()), raw) + "," + CsvText(security.c_str(), raw) + "," +
+                         CsvText(name.c_str(), raw) +
+                         "," + KindText(kind, body, OE_TAG_UNITS) + "," + KindText(kind, body, OE_TAG_UNITPRICE) +
+                         "," + KindText(kind, body, OE_TAG_COMMISSION) + "," + total + "," +
+                         KindText(kind, body, OE_TAG_SUBACCTSEC) + "," + KindText(kind, body, OE_TAG_SUBACCTFUND) +
+                         "," + KindText(kind, body, OE_TAG_SUBACCTFROM) + "," +
+                         KindText(kind, body, OE_TAG_SUBACCTTO) + "," +
+                         CsvText(tran ? tran->GetFITId().c_str() : "", raw) + "," +
+                         CsvText(tran ? tran->GetMemo().c_str() : "", raw);
+      rows.push_back({tran, std::move(line)});
+    }
+    // Trade-date order; transactions without a date last, each kind's
+    // order kept among equal dates.
+    std::stable_sort(rows.begin(), rows.end(), [](const Row& a, const Row& b) {
+      bool da = a.tran && a.tran->ValidateTag(OE_TAG_DTTRADE);
+      bool db = b.tran && b.tran->ValidateTag(OE_TAG_DTTRADE);
+      if (da != db) return da;
+      return da && a.tran->GetDtTrade() < b.tran->GetDtTrade();
+    });
+    for (const Row& row : rows) {
+      bool dated = row.tran && row.tran->ValidateTag(OE_TAG_DTTRADE);
+      std::printf("%s%s,%s\n", account.c_str(), dated ? IsoDate(row.tran->GetDtTrade()).c_str() : "",
+                  row.text.c_str());
+    }
+  }
+  return true;
+}
+
+int CmdPositions(int argc, char** argv) {
+  Args args(argc, argv, 2);
+  if (args.Flag("help")) {
+    std::fputs(kPositionsHelp, stdout);
+    return kClean;
+  }
+  bool balances = args.Flag("balances");
+  bool withAccount = args.Flag("account");
+  bool raw = args.Flag("raw");
+  bool strict = args.Flag("strict");
+  std::string error;
+  std::vector<std::string> files = args.Positional(&error);
+  if (!error.empty() || files.size() != 1) {
+    std::fprintf(stderr, "ofxkit positions: %s\n%s", error.empty() ? "expected one FILE" : error.c_str(),
+                 kPositionsHelp);
+    return kUsage;
+  }
+  ParsedFile parsed;
+  parsed.strict = strict;
+  int rc = ParseOFXFile(files[0], parsed, &error);
+  if (rc == kBadInput) {
+    std::fprintf(stderr, "ofxkit positions: %s\n", error.c_str());
+    return rc;
+  }
+  if (rc == kParseFailed)
+    std::fprintf(stderr, "ofxkit positions: the parse stopped early (status %d); what was read is shown\n",
+                 static_cast<int>(parsed.status));
+  std::vector<OEInvStmtRs*> statements;
+  CollectInvStatements(parsed.file.get(), statements);
+  Securities securities(parsed.file.get());
+  const char* prefix = withAccount ? "account," : "";
+  if (balances)
+    std::printf("%sname,value,type,description,asof\n", prefix);
+  else
+    std::printf("%ssecurity,name,kind,units,unitprice,mktval,priceasof,postype,heldinacct\n", prefix);
+  for (const OEInvStmtRs* rs : statements) {
+    std::string account = withAccount ? CsvText(InvAccountName(*rs).c_str(), raw) + "," : "";
+    if (balances) {
+      const OEInvBal* bal = rs->GetInvBal();
+      if (!bal) continue;
+      for (OETagID tag : {OE_TAG_AVAILCASH, OE_TAG_MARGINBALANCE, OE_TAG_SHORTBALANCE, OE_TAG_BUYPOWER})
+        if (bal->ValidateTag(tag))
+          std::printf("%s%s,%s,DOLLAR,,\n", account.c_str(), TagName(tag), ElementText(bal, tag).c_str());
+      const OEBalList* list = bal->GetBalList();
+      for (unsigned short i = 0, n = list ? list->GetNumBalance() : 0; i < n; ++i) {
+        const OEBalance* b = list->GetBalance(i);
+        if (!b) continue;
+        std::printf("%s%s,%s,%s,%s,%s\n", account.c_str(), CsvText(b->GetName().c_str(), raw).c_str(),
+                    ElementText(b, OE_TAG_VALUE).c_str(), ElementText(b, OE_TAG_BALTYPE).c_str(),
+                    CsvText(b->GetDescription().c_str(), raw).c_str(),
+                    b->ValidateTag(OE_TAG_DTASOF) ? IsoDate(b->GetDateAsOf()).c_str() : "");
+      }
+      continue;
+    }
+    const OEInvPosList* list = rs->GetInvPosList();
+    for (unsigned short i = 0, n = list ? list->GetNumberOfChildren() : 0; i < n; ++i) {
+      const OEDataObj* kind = list->GetChild(i);
+      const auto* pos = kind ? dynamic_cast<const OEInvPos*>(ChildOfType(kind, OE_TAG_INVPOS)) : nullptr;
+      if (!pos) continue;
+      std::string security, name;
+      securities.Describe(pos->GetSecID(), security, name);
+      std::printf("%s%s,%s,%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), CsvText(security.c_str(), raw).c_str(),
+                  CsvText(name.c_str(), raw).c_str(), TagName(kind->GetType()), ElementText(pos, OE_TAG_UNITS).c_str(),
+                  ElementText(pos, OE_TAG_UNITPRICE).c_str(), ElementText(pos, OE_TAG_MKTVAL).c_str(),
+                  pos->ValidateTag(OE_TAG_DTPRICEASOF) ? IsoDate(pos->GetDtPriceAsOf()).c_str() : "",
+                  ElementText(pos, OE_TAG_POSTYPE).c_str(), ElementText(pos, OE_TAG_HELDINACCT).c_str());
+    }
+  }
+  if (statements.empty())
+    std::fprintf(stderr, "ofxkit positions: no investment statement in %s\n", files[0].c_str());
+  return ReportLosses("positions", parsed, rc);
+}
+
+}  // namespace cli
