@@ -5,6 +5,11 @@
 
 #include "ofxkit/parse/OEParseLogger.h"
 
+namespace {
+// Entries a dynamic array can hold: its count is 16-bit.
+constexpr unsigned kMaxListEntries = 0xFFFF;
+}  // namespace
+
 // ---------------------------------------------------------------------------
 
 OEQuietConversion::OEQuietConversion() : m_wasEnabled(0), m_count(0) {
@@ -175,6 +180,14 @@ OEParseStatus OEAggregate::HandleTagStart(const OETagDictionaryEntry* const entr
   if (!child) return OE_PARSE_NO_PARSER;
   if (!d->put(this, child)) {
     delete child;
+    // A list counts its entries in 16 bits: one more than it can hold ends
+    // the parse here, with a warning that says so, rather than lose entries
+    // quietly or wrap the count.
+    if (d->kind == OE_FIELD_LIST && d->count && d->count(this) >= kMaxListEntries) {
+      char count[16];
+      snprintf(count, sizeof count, "%u", static_cast<unsigned>(kMaxListEntries) + 1u);
+      LogFieldFault(OEPW_OUTOFRANGE, entry->id, OEString(count));
+    }
     return OE_PARSE_NO_PARSER;
   }
   if (d->link) d->link(child, this, GetType());

@@ -1,8 +1,12 @@
 #include "ofxkit/core/OEDataObj.h"
 
 #include <dlfcn.h>
+#include <sys/mman.h>
 
+#include <cstdint>
+#include <cstdlib>
 #include <cstring>
+#include <mutex>
 #include <new>
 
 #include "ofxkit/core/OEDataObjFactory.h"
@@ -230,3 +234,194 @@ __attribute__((destructor)) void OnLibraryDetach() { ++g_detachCount; }
 void* GetOESDKInstance() { return g_moduleHandle; }
 uint32_t GetOESDKAttachCount() { return g_attachCount; }
 uint32_t GetOESDKDetachCount() { return g_detachCount; }
+
+// ---------------------------------------------------------------------------
+// Object blocks.
+
+#if defined(__SANITIZE_ADDRESS__)
+#define OE_OBJECTS_FROM_HEAP 1
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define OE_OBJECTS_FROM_HEAP 1
+#endif
+#endif
+
+namespace {
+
+#if !defined(OE_OBJECTS_FROM_HEAP)
+// Objects of up to kLargest bytes come from blocks, in size classes of
+// kGrain bytes, each class with a list of freed objects to reuse; larger ones
+// from the heap.
+constexpr size_t kGrain = 16;
+constexpr size_t kLargest = 4096;
+constexpr size_t kClasses = kLargest / kGrain;
+constexpr size_t kBlock = size_t{2} << 20;
+// Blocks kept, when no object is left, for the next parse to reuse.
+constexpr size_t kKeptWhenIdle = 8;
+
+struct FreeObject {
+  FreeObject* next;
+};
+
+// A block: this header, then the objects.
+struct Block {
+  Block* next;
+  size_t pad;  // keeps the objects 16-byte aligned
+};
+
+// Constant-initialized, so it is ready before any constructor runs; its
+// blocks are never unmapped at exit (objects may be deleted during exit).
+struct ObjectPool {
+  std::mutex lock;
+  FreeObject* freed[kClasses + 1] = {};
+  Block* blocks = nullptr;   // every block, in the order they were had
+  Block* current = nullptr;  // the block being carved
+  char* cursor = nullptr;
+  char* limit = nullptr;
+  size_t live = 0;  // objects handed out and not yet freed
+};
+
+ObjectPool& Pool() {
+  static ObjectPool pool;
+  return pool;
+}
+
+Block* NewBlock() {
+  void* memory = nullptr;
+#if defined(__linux__)
+  // Aligned to the huge page size, so the whole block can be one.
+  void* mapped = mmap(nullptr, kBlock * 2, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+  if (mapped == MAP_FAILED) return nullptr;
+  uintptr_t start = reinterpret_cast<uintptr_t>(mapped);
+  uintptr_t aligned = (start + kBlock - 1) & ~(kBlock - 1);
+  if (aligned > start) munmap(mapped, aligned - start);
+  if (aligned + kBlock < start + kBlock * 2) munmap(reinterpret_cast<void*>(aligned + kBlock), start + kBlock - aligned);
+  memory = reinterpret_cast<void*>(aligned);
+  madvise(memory, kBlock, MADV_HUGEPAGE);
+#else
+  memory = malloc(kBlock);
+  if (!memory) return nullptr;
+#endif
+  Block* block = static_cast<Block*>(memory);
+  block->next = nullptr;
+  return block;
+}
+
+void FreeBlock(Block* block) {
+#if defined(__linux__)
+  munmap(block, kBlock);
+#else
+  free(block);
+#endif
+}
+
+void StartCarving(ObjectPool& pool, Block* block) {
+  pool.current = block;
+  pool.cursor = reinterpret_cast<char*>(block + 1);
+  pool.limit = reinterpret_cast<char*>(block) + kBlock;
+}
+
+void* TakeObject(size_t size) {
+  if (size == 0) size = 1;
+  if (size > kLargest) return ::operator new(size, std::nothrow);
+  size_t sizeClass = (size + kGrain - 1) / kGrain;
+  size_t bytes = sizeClass * kGrain;
+  ObjectPool& pool = Pool();
+  std::lock_guard<std::mutex> guard(pool.lock);
+  if (FreeObject* reused = pool.freed[sizeClass]) {
+    pool.freed[sizeClass] = reused->next;
+    ++pool.live;
+    return reused;
+  }
+  if (static_cast<size_t>(pool.limit - pool.cursor) < bytes) {
+    Block* next = pool.current ? pool.current->next : nullptr;  // a block kept from before
+    if (!next) {
+      next = NewBlock();
+      if (!next) return nullptr;
+      if (pool.current) {
+        pool.current->next = next;
+      } else {
+        next->next = pool.blocks;
+        pool.blocks = next;
+      }
+    }
+    StartCarving(pool, next);
+  }
+  void* object = pool.cursor;
+  pool.cursor += bytes;
+  ++pool.live;
+  return object;
+}
+
+// When the last object goes, the free lists are dropped and carving starts
+// again from the first block; blocks beyond the few kept go back.
+void Idle(ObjectPool& pool) {
+  for (FreeObject*& list : pool.freed) list = nullptr;
+  Block* block = pool.blocks;
+  for (size_t kept = 1; block && kept < kKeptWhenIdle; ++kept) block = block->next;
+  if (block) {
+    Block* extra = block->next;
+    block->next = nullptr;
+    while (extra) {
+      Block* next = extra->next;
+      FreeBlock(extra);
+      extra = next;
+    }
+  }
+  if (pool.blocks) StartCarving(pool, pool.blocks);
+}
+
+void GiveBack(void* p, size_t size) {
+  if (!p) return;
+  if (size == 0) size = 1;
+  if (size > kLargest) {
+    ::operator delete(p);
+    return;
+  }
+  size_t sizeClass = (size + kGrain - 1) / kGrain;
+  ObjectPool& pool = Pool();
+  std::lock_guard<std::mutex> guard(pool.lock);
+  FreeObject* freed = static_cast<FreeObject*>(p);
+  freed->next = pool.freed[sizeClass];
+  pool.freed[sizeClass] = freed;
+  if (--pool.live == 0) Idle(pool);
+}
+
+// For the one release that comes without a size (a constructor that threw).
+bool FromBlocks(void* p) {
+  ObjectPool& pool = Pool();
+  std::lock_guard<std::mutex> guard(pool.lock);
+  for (Block* block = pool.blocks; block; block = block->next) {
+    char* start = reinterpret_cast<char*>(block);
+    if (static_cast<char*>(p) >= start && static_cast<char*>(p) < start + kBlock) return true;
+  }
+  return false;
+}
+#endif
+
+}  // namespace
+
+#if !defined(OE_OBJECTS_FROM_HEAP)
+void* OEDataObj::operator new(std::size_t size) {
+  void* p = TakeObject(size);
+  if (!p) throw std::bad_alloc();
+  return p;
+}
+
+void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept { return TakeObject(size); }
+
+void OEDataObj::operator delete(void* p, std::size_t size) noexcept { GiveBack(p, size); }
+
+void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept {
+  // Only a constructor that threw comes here: the object is not counted as
+  // freed (its size is not known), only its memory is not reused.
+  if (p && !FromBlocks(p)) ::operator delete(p);
+}
+#else
+void* OEDataObj::operator new(std::size_t size) { return ::operator new(size); }
+void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept {
+  return ::operator new(size, std::nothrow);
+}
+void OEDataObj::operator delete(void* p, std::size_t) noexcept { ::operator delete(p); }
+void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept { ::operator delete(p); }
+#endif

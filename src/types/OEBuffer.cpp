@@ -1,7 +1,14 @@
 #include "ofxkit/types/OEBuffer.h"
 
+#if defined(__linux__)
+#include <sys/mman.h>
+#endif
+
+#include <cerrno>
+#include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <new>
 
 OEBuffer::OEBuffer(uint32_t initialSize, uint32_t growBy)
     : m_data(nullptr), m_allocation(0), m_growBy(0), m_size(0), m_offset(0) {
@@ -38,8 +45,14 @@ OEBuffer& OEBuffer::operator=(const OEBuffer& other) {
 
 OEBuffer::~OEBuffer() {
   if (m_data) {
+    // Zeroed in a way the compiler may not drop, at memset's speed where the
+    // C library offers it (a whole statement is megabytes).
+#if defined(__GLIBC__)
+    explicit_bzero(m_data, m_allocation);
+#else
     volatile char* p = m_data;
     for (uint32_t i = 0; i < m_allocation; ++i) p[i] = 0;
+#endif
     free(m_data);
   }
 }
@@ -191,3 +204,60 @@ unsigned short OEBuffer::SetBufferOffset(uint32_t n) {
   m_offset = n;
   return 1;
 }
+
+// ---------------------------------------------------------------------------
+
+OELargeBuffer::OELargeBuffer(uint32_t ceiling, uint32_t growBy)
+    : OEBuffer(0, growBy), m_ceiling(ceiling > kMaxCeiling ? kMaxCeiling : ceiling) {}
+
+namespace {
+void SetError(int* error, int value) {
+  if (error) *error = value;
+}
+}  // namespace
+
+OEBuffer* OEReadFileIntoBuffer(const char* path, int* error) {
+  SetError(error, 0);
+  FILE* f = path ? fopen(path, "rb") : nullptr;
+  if (!f) {
+    SetError(error, path ? errno : EINVAL);
+    return nullptr;
+  }
+  OEBuffer* buffer = nullptr;
+  int failure = 0;
+  long size = -1;
+  if (fseek(f, 0, SEEK_END) == 0) size = ftell(f);
+  if (size < 0 || fseek(f, 0, SEEK_SET) != 0) {
+    failure = errno ? errno : EIO;  // not a regular file (a pipe, a directory)
+  } else if (static_cast<unsigned long>(size) >= OELargeBuffer::kMaxCeiling) {
+    failure = EFBIG;
+  } else {
+    uint32_t length = static_cast<uint32_t>(size);
+    buffer = new (std::nothrow) OELargeBuffer(length + 1);
+    if (!buffer || buffer->AllocateTo(length + 1) != OEBUF_OK || !buffer->GetBufferPtr()) {
+      failure = ENOMEM;
+    } else {
+#if defined(__linux__)
+      // Megabytes of text: let the kernel back them with huge pages where it
+      // offers them, rather than fault them in 4 KB at a time.
+      constexpr uintptr_t kHuge = uintptr_t{2} << 20;
+      uintptr_t start = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + kHuge - 1) & ~(kHuge - 1);
+      uintptr_t end = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + length) & ~(kHuge - 1);
+      if (end > start) madvise(reinterpret_cast<void*>(start), end - start, MADV_HUGEPAGE);
+#endif
+      size_t got = length ? fread(buffer->GetBufferPtr(), 1, length, f) : 0;
+      // A file that changed size under us: what was read is what there is.
+      if (got != length && ferror(f)) failure = EIO;
+      if (got) buffer->SetBufferSize(static_cast<uint32_t>(got));
+    }
+  }
+  fclose(f);
+  if (failure) {
+    delete buffer;
+    if (failure == ENOMEM) g_allocFailed = 1;
+    SetError(error, failure);
+    return nullptr;
+  }
+  return buffer;
+}
+

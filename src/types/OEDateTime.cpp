@@ -603,7 +603,10 @@ unsigned short OEDateTimeBase::ImportBinary(const void* src) {
   const char* name = record + layout->offset[kRecordFields];
   unsigned short nameLength = 0;
   while (nameLength < kRecordNameLen && name[nameLength] != '\0') ++nameLength;
-  if (nameLength == 0 || (nameLength == 3 && memcmp(name, m_timeZoneNotInitialized, 3) == 0))
+  // "***" marks a record written from a value without a zone name: the name
+  // this value already holds stays.
+  if (nameLength == 3 && memcmp(name, m_timeZoneNotInitialized, 3) == 0) return 1;
+  if (nameLength == 0)
     ClearTimeZoneName();
   else
     m_timeZoneName.Assign(name, nameLength);

@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <new>
+#include <typeinfo>
 #include <utility>
 
 unsigned short g_allocFailed = 0;
@@ -13,7 +14,7 @@ constexpr size_t kMaxBlock = 0xFFFF;  // a block holds at most 65535 bytes
 }
 
 OEString::OEString()
-    : m_specLength(kNoLimit), m_text(nullptr), m_bufferSize(0), m_length(0), m_encoding(OE_ENCODE_PLAIN) {}
+    : m_encoding(OE_ENCODE_PLAIN), m_specLength(kNoLimit), m_bufferSize(0), m_length(0), m_store() {}
 
 OEString::OEString(const char* text) : OEString() {
   if (text) Assign(text, strlen(text));
@@ -24,27 +25,37 @@ OEString::OEString(const char* text, size_t length) : OEString() {
 }
 
 OEString::OEString(const OEString& other) : OEString() {
-  Assign(other.m_text, other.m_length);
+  Assign(other.c_str(), other.m_length);
   m_encoding = other.m_encoding;
   m_specLength = other.m_specLength;
 }
 
-OEString::OEString(OEString&& other) noexcept
-    : m_specLength(other.m_specLength),
-      m_text(other.m_text),
-      m_bufferSize(other.m_bufferSize),
-      m_length(other.m_length),
-      m_encoding(other.m_encoding) {
-  other.m_text = nullptr;
+OEString::OEString(OEString&& other) noexcept : OEString() {
+  TakeStorage(other);
+  m_encoding = other.m_encoding;
+  m_specLength = other.m_specLength;
+}
+
+OEString::~OEString() {
+  if (!IsInline()) free(HeapBlock());
+}
+
+// Takes other's block (its address, or the inline bytes) and leaves other null.
+void OEString::TakeStorage(OEString& other) {
+  Release();
+  memcpy(m_store, other.m_store, sizeof m_store);
+  m_bufferSize = other.m_bufferSize;
+  m_length = other.m_length;
+  memset(other.m_store, 0, sizeof other.m_store);
   other.m_bufferSize = 0;
   other.m_length = 0;
 }
 
-OEString::~OEString() { free(m_text); }
-
 void OEString::Release() {
-  free(m_text);
-  m_text = nullptr;
+  if (IsInline())
+    memset(m_store, 0, m_bufferSize);  // no text (a password's) is left behind
+  else
+    free(HeapBlock());
   m_bufferSize = 0;
   m_length = 0;
 }
@@ -56,14 +67,32 @@ bool OEString::EnsureRoom(size_t n) {
     Release();
     return false;
   }
-  char* block = static_cast<char*>(realloc(m_text, n));
+  const bool first = m_bufferSize == 0;
+  if (n <= kInlineBlock) {  // still fits inside: only the size changes
+    if (first) memset(m_store, 0, n);
+    m_bufferSize = static_cast<unsigned short>(n);
+    return true;
+  }
+  char* block;
+  if (IsInline()) {
+    block = static_cast<char*>(malloc(n));
+    if (block) {
+      if (first) {
+        memset(block, 0, n);
+      } else {
+        memcpy(block, m_store, m_bufferSize);
+        memset(m_store, 0, sizeof m_store);
+      }
+    }
+  } else {
+    block = static_cast<char*>(realloc(HeapBlock(), n));
+  }
   if (!block) {
     g_allocFailed = 1;
     Release();
     return false;
   }
-  if (!m_text) memset(block, 0, n);
-  m_text = block;
+  SetHeapBlock(block);
   m_bufferSize = static_cast<unsigned short>(n);
   return true;
 }
@@ -73,28 +102,30 @@ void OEString::Assign(const char* text, size_t length) {
     Release();
     return;
   }
-  if (text >= m_text && text < m_text + m_bufferSize) {  // assigning part of ourselves
+  if (m_bufferSize && text >= Block() && text < Block() + m_bufferSize) {  // assigning part of ourselves
     OEString copy(text, length);
-    Assign(copy.m_text, copy.m_length);
+    Assign(copy.c_str(), copy.m_length);
     return;
   }
   if (!EnsureRoom(length + 1)) return;
-  memcpy(m_text, text, length);
-  m_text[length] = '\0';
+  char* block = Block();
+  memcpy(block, text, length);
+  block[length] = '\0';
   m_length = static_cast<unsigned short>(length);
 }
 
 void OEString::Append(const char* text, size_t length) {
   if (!text || length == 0) return;
-  if (m_text && text >= m_text && text < m_text + m_bufferSize) {
+  if (m_bufferSize && text >= Block() && text < Block() + m_bufferSize) {
     OEString copy(text, length);
-    Append(copy.m_text, copy.m_length);
+    Append(copy.c_str(), copy.m_length);
     return;
   }
   size_t oldLength = m_length;
   if (!EnsureRoom(oldLength + length + 1)) return;
-  memcpy(m_text + oldLength, text, length);
-  m_text[oldLength + length] = '\0';
+  char* block = Block();
+  memcpy(block + oldLength, text, length);
+  block[oldLength + length] = '\0';
   m_length = static_cast<unsigned short>(oldLength + length);
 }
 
@@ -110,22 +141,22 @@ OEString& OEString::operator=(const OEString& other) {
 }
 
 OEString& OEString::operator=(OEString&& other) noexcept {
-  if (this != &other) {
-    free(m_text);
-    m_text = other.m_text;
-    m_bufferSize = other.m_bufferSize;
-    m_length = other.m_length;
-    m_encoding = other.m_encoding;
-    m_specLength = other.m_specLength;
-    other.m_text = nullptr;
-    other.m_bufferSize = 0;
-    other.m_length = 0;
+  if (this == &other) return *this;
+  // A string of a derived class keeps its own rules for the limit (a fixed
+  // length keeps its own, an e-mail body picks one): assignment through an
+  // OEString& goes to its copying assignment, as an lvalue's would.
+  if (typeid(*this) != typeid(OEString)) {
+    operator=(static_cast<const OEString&>(other));
+    return *this;
   }
+  TakeStorage(other);
+  m_encoding = other.m_encoding;
+  m_specLength = other.m_specLength;
   return *this;
 }
 
 void OEString::AssignTextAndEncoding(const OEString& other) {
-  if (this != &other) Assign(other.m_text, other.m_length);
+  if (this != &other) Assign(other.c_str(), other.m_length);
   m_encoding = other.m_encoding;
 }
 
@@ -140,49 +171,56 @@ OEString& OEString::operator+=(char c) {
 }
 
 void OEString::Clear(char c) {
-  if (!m_text) return;
-  memset(m_text, c, m_bufferSize);
-  m_text[m_bufferSize - 1] = '\0';
-  m_length = static_cast<unsigned short>(strlen(m_text));
+  if (!m_bufferSize) return;
+  char* block = Block();
+  memset(block, c, m_bufferSize);
+  block[m_bufferSize - 1] = '\0';
+  m_length = static_cast<unsigned short>(strlen(block));
 }
 
 unsigned short OEString::IsValid() const { return m_specLength >= m_length; }
 
 void OEString::Truncate(unsigned short n) {
-  if (!m_text || n >= m_length) return;
-  m_text[n] = '\0';
-  m_length = static_cast<unsigned short>(strlen(m_text));
+  if (!m_bufferSize || n >= m_length) return;
+  char* block = Block();
+  block[n] = '\0';
+  m_length = static_cast<unsigned short>(strlen(block));
 }
 
 void OEString::TruncateToSpec() { Truncate(SpecLength()); }
 
 void OEString::MakeUpper() {
+  char* block = Block();
   for (unsigned short i = 0; i < m_length; ++i)
-    m_text[i] = static_cast<char>(toupper(static_cast<unsigned char>(m_text[i])));
+    block[i] = static_cast<char>(toupper(static_cast<unsigned char>(block[i])));
 }
 
 void OEString::MakeLower() {
+  char* block = Block();
   for (unsigned short i = 0; i < m_length; ++i)
-    m_text[i] = static_cast<char>(tolower(static_cast<unsigned char>(m_text[i])));
+    block[i] = static_cast<char>(tolower(static_cast<unsigned char>(block[i])));
 }
 
 void OEString::TrimLeadingSpaces() {
-  if (!m_text) return;
+  if (!m_bufferSize) return;
+  char* block = Block();
   unsigned short skip = 0;
-  while (skip < m_length && m_text[skip] == ' ') ++skip;
+  while (skip < m_length && block[skip] == ' ') ++skip;
   if (skip == 0) return;
-  memmove(m_text, m_text + skip, m_length - skip + 1u);
-  m_length = static_cast<unsigned short>(strlen(m_text));
+  memmove(block, block + skip, m_length - skip + 1u);
+  m_length = static_cast<unsigned short>(strlen(block));
 }
 
 void OEString::TrimTrailingSpaces() {
-  if (!m_text) return;
-  while (m_length > 0 && m_text[m_length - 1] == ' ') m_text[--m_length] = '\0';
+  if (!m_bufferSize) return;
+  char* block = Block();
+  while (m_length > 0 && block[m_length - 1] == ' ') block[--m_length] = '\0';
 }
 
 unsigned short OEString::IsWhiteSpace() const {
+  const char* block = c_str();
   for (unsigned short i = 0; i < m_length; ++i) {
-    char c = m_text[i];
+    char c = block[i];
     if (c != ' ' && c != '\n' && c != '\r' && c != '\t') return 0;
   }
   return 1;
@@ -192,20 +230,20 @@ bool OEString::operator==(const char* text) const {
   bool mineEmpty = m_length == 0;
   bool theirsEmpty = !text || *text == '\0';
   if (mineEmpty || theirsEmpty) return mineEmpty == theirsEmpty;
-  return strcmp(m_text, text) == 0;
+  return strcmp(Block(), text) == 0;
 }
 
 bool OEString::operator==(const OEString& other) const {
   if (m_length != other.m_length) return false;
   if (m_length == 0) return true;
-  return memcmp(m_text, other.m_text, m_length) == 0;
+  return memcmp(Block(), other.Block(), m_length) == 0;
 }
 
 unsigned short OEString::strcmpi(const char* text) const {
   bool mineEmpty = m_length == 0;
   bool theirsEmpty = !text || *text == '\0';
   if (mineEmpty || theirsEmpty) return mineEmpty == theirsEmpty;
-  const unsigned char* a = reinterpret_cast<const unsigned char*>(m_text);
+  const unsigned char* a = reinterpret_cast<const unsigned char*>(Block());
   const unsigned char* b = reinterpret_cast<const unsigned char*>(text);
   for (;; ++a, ++b) {
     unsigned char ca = *a, cb = *b;
@@ -217,17 +255,18 @@ unsigned short OEString::strcmpi(const char* text) const {
 }
 
 char* OEString::LockBuffer(unsigned short n) {
-  if (!EnsureRoom(n)) return nullptr;
-  return m_text;
+  if (!EnsureRoom(n) || !m_bufferSize) return nullptr;
+  return Block();
 }
 
 void OEString::UnlockBuffer() {
-  if (!m_text) {
+  if (!m_bufferSize) {
     m_length = 0;
     return;
   }
-  m_text[m_bufferSize - 1] = '\0';
-  m_length = static_cast<unsigned short>(strlen(m_text));
+  char* block = Block();
+  block[m_bufferSize - 1] = '\0';
+  m_length = static_cast<unsigned short>(strlen(block));
 }
 
 OEString operator+(const OEString& a, const OEString& b) {

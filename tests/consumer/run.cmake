@@ -19,6 +19,30 @@ execute_process(COMMAND ${WORK_DIR}/build/consumer RESULT_VARIABLE rc)
 if(rc)
   message(FATAL_ERROR "consumer run failed: ${rc}")
 endif()
+# A program that only reads and writes OFX loads neither the transport nor
+# the libraries that come with it.
+execute_process(COMMAND ${WORK_DIR}/build/consumer_core RESULT_VARIABLE rc)
+if(rc)
+  message(FATAL_ERROR "parse-only consumer run failed: ${rc}")
+endif()
+execute_process(COMMAND ldd ${WORK_DIR}/build/consumer_core OUTPUT_VARIABLE loaded RESULT_VARIABLE rc)
+if(rc OR loaded MATCHES "libcurl|libssl|libcrypto|libofxkit_net")
+  message(FATAL_ERROR "a parse-only program loads more than it needs:\n${loaded}")
+endif()
+# The installed tool runs from its prefix as it stands (no LD_LIBRARY_PATH),
+# for reading files and, through its module, for the network commands.
+file(WRITE ${WORK_DIR}/small.ofx "OFXHEADER:100\nDATA:OFXSGML\nVERSION:102\nSECURITY:NONE\nENCODING:USASCII\n"
+  "CHARSET:1252\nCOMPRESSION:NONE\nOLDFILEUID:NONE\nNEWFILEUID:NONE\n\n<OFX><SIGNONMSGSRSV1><SONRS><STATUS>"
+  "<CODE>0<SEVERITY>INFO</STATUS><DTSERVER>20261122<LANGUAGE>ENG</SONRS></SIGNONMSGSRSV1></OFX>\n")
+unset(ENV{LD_LIBRARY_PATH})
+execute_process(COMMAND ${PREFIX}/bin/ofxkit dump ${WORK_DIR}/small.ofx OUTPUT_VARIABLE dumped RESULT_VARIABLE rc)
+if(rc OR NOT dumped MATCHES "LANGUAGE = ENG")
+  message(FATAL_ERROR "installed ofxkit dump failed (${rc}):\n${dumped}")
+endif()
+execute_process(COMMAND ${PREFIX}/bin/ofxkit exchange --help OUTPUT_VARIABLE help RESULT_VARIABLE rc)
+if(rc OR NOT help MATCHES "usage: ofxkit exchange")
+  message(FATAL_ERROR "installed ofxkit exchange does not load (${rc}):\n${help}")
+endif()
 # pkg-config must give flags that compile and link the same program.
 file(GLOB_RECURSE pcfile ${PREFIX}/*/ofxkit.pc)
 get_filename_component(pcdir "${pcfile}" DIRECTORY)

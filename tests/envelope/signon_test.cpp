@@ -156,6 +156,46 @@ TEST_F(SignOnTest, ResponseReadsAndWritesItsElements) {
   EXPECT_EQ(Write(copy), Write(*rs));
 }
 
+// A text the setter cannot convert is OEPW_BADFORMAT whatever code the
+// conversion gives the same fault (too long for a language, out of range for
+// a number, a date beyond its fields): one warning, the tag absent.
+TEST_F(SignOnTest, TextSettersReportFailedConversionsAsBadFormat) {
+  OESignOnRq rq;
+  OESignOnRs rs;
+  struct Case {
+    const char* what;
+    unsigned short (*set)(OESignOnRq&, OESignOnRs&, const OEString&);
+    const char* text;
+    OETagID tag;
+  };
+  const Case cases[] = {
+      {"language", [](OESignOnRq& q, OESignOnRs&, const OEString& t) { return q.SetLanguage(t); }, "ENGL",
+       OE_TAG_LANGUAGE},
+      {"response language", [](OESignOnRq&, OESignOnRs& r, const OEString& t) { return r.SetLanguage(t); },
+       "ENGLISH", OE_TAG_LANGUAGE},
+      {"app version out of range", [](OESignOnRq& q, OESignOnRs&, const OEString& t) { return q.SetAppVer(t); },
+       "70000", OE_TAG_APPVER},
+      {"bid out of range", [](OESignOnRq&, OESignOnRs& r, const OEString& t) { return r.SetVexaBid(t); },
+       "99999999999", OE_TAG_VEXA_BID},
+      {"client date out of range", [](OESignOnRq& q, OESignOnRs&, const OEString& t) { return q.SetDtClient(t); },
+       "20261340", OE_TAG_DTCLIENT},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    log->DeleteAll();
+    EXPECT_EQ(c.set(rq, rs, OEString(c.text)), 0);
+    ASSERT_EQ(log->Entries(), 1);
+    EXPECT_EQ(log->Get(0)->warning, OEPW_BADFORMAT);
+    EXPECT_STREQ(log->Get(0)->value.c_str(), c.text);
+    EXPECT_EQ(log->Get(0)->tag, c.tag);
+  }
+  EXPECT_EQ(rq.ValidateTag(OE_TAG_LANGUAGE), 0);
+  EXPECT_EQ(rq.ValidateTag(OE_TAG_APPVER), 0);
+  EXPECT_EQ(rq.ValidateTag(OE_TAG_DTCLIENT), 0);
+  EXPECT_EQ(rs.ValidateTag(OE_TAG_LANGUAGE), 0);
+  EXPECT_EQ(rs.ValidateTag(OE_TAG_VEXA_BID), 0);
+}
+
 TEST_F(SignOnTest, VexaBidTakesOnlyNumbers) {
   OESignOnRs rs;
   EXPECT_EQ(rs.SetVexaBid(OEString("12345")), 1);

@@ -57,9 +57,11 @@ TEST_F(ParseLogTest, CopyingKeepsTheWarningsOfAParse) {
   log->AppendParseException(OEPW_TOOLONG, "value", "NAME", OE_TAG_NAME, nullptr);
   log->AppendParseException(OEPW_LOWERCASE, "", "bankid", OE_TAG_BANKID, nullptr);
 
-  // A private log whose logging is off takes the shared log's flags first.
-  struct PrivateLog : OEParseLogger {};
-  PrivateLog kept;
+  // An application's own log whose logging is off takes the shared log's
+  // flags first.
+  OEParseLogger kept;
+  EXPECT_EQ(kept.Entries(), 0);
+  EXPECT_EQ(kept.GetLoggingEnabled(), 1);
   kept.EnableLogging(0);
   OEParser parser;  // clears the shared log: re-add after it
   log->AppendParseException(OEPW_TOOLONG, "value", "NAME", OE_TAG_NAME, nullptr);

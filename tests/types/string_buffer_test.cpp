@@ -1,7 +1,10 @@
 #include <gtest/gtest.h>
 
+#include <cerrno>
+#include <cstdio>
 #include <cstring>
 #include <string>
+#include <utility>
 
 #include "ofxkit/ofxkit.h"
 
@@ -140,6 +143,138 @@ TEST(OEString, SpecialLimits) {
   multi.SetSpecLength(12);
   multi = OEString("abc");
   EXPECT_EQ(multi.SpecLength(), 12);
+}
+
+// The limit belongs to the target in every assignment, also through a
+// reference to the base class and from a temporary.
+TEST(OEString, LimitBelongsToTheTargetThroughABaseReference) {
+  const std::string forty(40, 'x');
+  OEString32 s;
+  OEString& r = s;
+  r = OEString(forty.c_str());
+  EXPECT_EQ(s.SpecLength(), 32);
+  EXPECT_FALSE(s.IsValid());
+  EXPECT_EQ(s.GetStrLength(), 40);
+
+  OEMultiLenString multi;
+  multi.SetSpecLength(10);
+  OEString& m = multi;
+  m = OEString("01234567890123");
+  EXPECT_EQ(multi.SpecLength(), 10);
+  EXPECT_FALSE(multi.IsValid());
+
+  OEEMailMsgBody body;
+  OEString tenThousand("text");
+  tenThousand.SetSpecLength(10000);
+  static_cast<OEString&>(body) = std::move(tenThousand);
+  EXPECT_EQ(body.SpecLength(), 10000);
+
+  OEUserPassword password;
+  static_cast<OEString&>(password) = OEString(forty.c_str());
+  EXPECT_EQ(password.SpecLength(), 171);
+  EXPECT_EQ(password.GetStrLength(), 40);
+
+  // A plain string still takes everything from a temporary.
+  OEString plain;
+  OEString32 source("abc");
+  plain = std::move(source);
+  EXPECT_EQ(plain.SpecLength(), 32);
+  EXPECT_EQ(plain, "abc");
+  EXPECT_TRUE(source.IsNull());
+}
+
+// Short texts live inside the string and long ones on the heap; the block
+// behaves the same on both sides of that line and across it.
+TEST(OEString, StorageAcrossTheInlineBoundary) {
+  const int inlineBlock = OEString::kInlineBlock;
+  for (int n : {1, 2, inlineBlock - 1, inlineBlock, inlineBlock + 1, 200}) {
+    SCOPED_TRACE(n);
+    const std::string text(static_cast<size_t>(n - 1), 'a');
+    OEString s(text.c_str());
+    EXPECT_EQ(s.BufferSize(), text.empty() ? 0 : n);
+    EXPECT_EQ(std::string(s.c_str()), text);
+
+    // Growing one character at a time keeps the text and exact fit.
+    OEString grown;
+    for (size_t i = 0; i < text.size(); ++i) grown += 'a';
+    EXPECT_EQ(grown, s);
+    EXPECT_EQ(grown.BufferSize(), s.BufferSize());
+
+    // Copies and moves carry the text whichever side it is on.
+    OEString copy(s);
+    OEString moved(std::move(copy));
+    EXPECT_EQ(moved, s);
+    EXPECT_TRUE(copy.IsNull());
+    OEString assigned;
+    assigned = std::move(moved);
+    EXPECT_EQ(assigned, s);
+
+    // Clear fills the whole block, wherever it is.
+    if (!text.empty()) {
+      assigned.Clear('*');
+      EXPECT_EQ(std::string(assigned.c_str()), std::string(static_cast<size_t>(n - 1), '*'));
+    }
+  }
+  // Assigning part of itself, across the line.
+  OEString self("0123456789012345678901234567890123456789");
+  self = self + 30;
+  EXPECT_EQ(self, "0123456789");
+  self += self;
+  EXPECT_EQ(self, "01234567890123456789");
+  self.Append(self.c_str(), self.GetStrLength());
+  EXPECT_EQ(self, "0123456789012345678901234567890123456789");
+  // The block never shrinks while text is held.
+  EXPECT_EQ(self.BufferSize(), 41);
+  self = "ab";
+  EXPECT_EQ(self.BufferSize(), 41);
+  EXPECT_EQ(self, "ab");
+}
+
+TEST(OELargeBuffer, CeilingIsChosenWhenMade) {
+  std::string bytes(5000000, 'b');
+  OELargeBuffer large(6000000, 0);
+  EXPECT_EQ(large.WriteLarge(bytes.data(), 5000000), OEBUF_OK);
+  EXPECT_EQ(large.GetBufferSize(), 5000000u);
+  EXPECT_EQ(large.WriteLarge(bytes.data(), 999999), OEBUF_OK);
+  EXPECT_EQ(large.Write('x'), OEBUF_OUTOFRANGE);  // would end at the ceiling
+  EXPECT_EQ(large.GetBufferSize(), 5999999u);
+  EXPECT_EQ(large.GetCh(5999998), 'b');
+  OEBuffer plain;
+  EXPECT_EQ(plain.WriteLarge(bytes.data(), 5000000), OEBUF_OUTOFRANGE);
+}
+
+TEST(OELargeBuffer, WholeFilesOfAnySizeAreRead) {
+  const std::string path = ::testing::TempDir() + "ofxkit_read_file_test.bin";
+  std::string content(4500000, 'q');
+  content[0] = '<';
+  content[4499999] = '>';
+  FILE* f = fopen(path.c_str(), "wb");
+  ASSERT_NE(f, nullptr);
+  ASSERT_EQ(fwrite(content.data(), 1, content.size(), f), content.size());
+  fclose(f);
+  int error = -1;
+  OEBuffer* buffer = OEReadFileIntoBuffer(path.c_str(), &error);
+  ASSERT_NE(buffer, nullptr);
+  EXPECT_EQ(error, 0);
+  EXPECT_EQ(buffer->GetBufferSize(), 4500000u);
+  EXPECT_EQ(buffer->GetBufferOffset(), 0u);
+  EXPECT_EQ(memcmp(buffer->GetBufferPtr(), content.data(), content.size()), 0);
+  delete buffer;
+
+  f = fopen(path.c_str(), "wb");
+  fclose(f);
+  buffer = OEReadFileIntoBuffer(path.c_str(), &error);
+  ASSERT_NE(buffer, nullptr);  // an empty file is an empty buffer
+  EXPECT_EQ(buffer->GetBufferSize(), 0u);
+  delete buffer;
+  remove(path.c_str());
+
+  EXPECT_EQ(OEReadFileIntoBuffer(path.c_str(), &error), nullptr);
+  EXPECT_EQ(error, ENOENT);
+  EXPECT_EQ(OEReadFileIntoBuffer(::testing::TempDir().c_str(), &error), nullptr);  // a directory
+  EXPECT_NE(error, 0);
+  EXPECT_EQ(OEReadFileIntoBuffer(nullptr, &error), nullptr);
+  EXPECT_EQ(error, EINVAL);
 }
 
 TEST(OEBuffer, GrowthAndCeiling) {

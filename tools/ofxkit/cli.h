@@ -71,11 +71,16 @@ int ExitForStatus(OEParseStatus status);
 // the file were not read: ...") on standard error and answers the exit status:
 // rc, but never kClean when something of the file was not read.
 int ReportLosses(const char* command, const ParsedFile& parsed, int rc);
+// Text of the file read last (by ParseOFXFile or ParseOFXBuffer) as UTF-8,
+// converted from the character set its header names; bytes that do not
+// convert are counted (and named by field, when given) for ReportLosses to
+// report. Every text of the file that the tool prints goes through here.
+std::string OutputText(const char* text, const char* field = nullptr);
 // A text field of CSV output: quoted when it holds a comma, quote or line
-// break. Unless raw, a text that a spreadsheet would run as a formula (one
+// break, converted as OutputText does. Unless raw, a text that a spreadsheet would run as a formula (one
 // that begins with '=', '+', '-', '@', a tab or a carriage return) is
 // prefixed with a single quote. Amounts and dates are not passed through here.
-std::string CsvText(const char* text, bool raw);
+std::string CsvText(const char* text, bool raw, const char* field = nullptr);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard
@@ -201,6 +206,8 @@ int CmdRequest(int argc, char** argv);
 int CmdRespond(int argc, char** argv);
 int CmdExchange(int argc, char** argv);
 int CmdServe(int argc, char** argv);
+// Runs a command of the network module (exchange, serve), loading it first.
+int RunNetCommand(const char* name, int argc, char** argv);
 int CmdCheck(int argc, char** argv);
 
 }  // namespace cli

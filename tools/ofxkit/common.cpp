@@ -9,10 +9,17 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <memory>
 
+#include "charset.h"
 #include "cli.h"
 
 namespace cli {
+
+namespace {
+// The text of the file the command read last, as UTF-8 for output.
+std::unique_ptr<Utf8Converter> g_fileText;
+}  // namespace
 
 Args::Args(int argc, char** argv, int first) {
   for (int i = first; i < argc; ++i) m_args.emplace_back(argv[i]);
@@ -218,9 +225,14 @@ int ExitForStatus(OEParseStatus status) {
 }
 
 int ParseOFXFile(const std::string& path, ParsedFile& parsed, std::string* error) {
-  OEBuffer buffer;
-  if (!ReadFile(path, buffer, error)) return kBadInput;
-  return ParseOFXBuffer(buffer, path, parsed, error);
+  // A buffer as large as the file, however large that is.
+  int failure = 0;
+  std::unique_ptr<OEBuffer> buffer(OEReadFileIntoBuffer(path.c_str(), &failure));
+  if (!buffer) {
+    *error = path + ": " + (failure == EFBIG ? "too large (files of up to 2 GB can be read)" : std::strerror(failure));
+    return kBadInput;
+  }
+  return ParseOFXBuffer(*buffer, path, parsed, error);
 }
 
 int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed, std::string* error) {
@@ -238,10 +250,18 @@ int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed
   parsed.status = parser.Parse(&buffer, parsed.file.get(), 0);
   parsed.objectWithError = parser.GetObjectWithError();
   parsed.audit = ofxkit::AuditParse(buffer, *parsed.file);
+  g_fileText = std::make_unique<Utf8Converter>(CharsetOf(*parsed.file));
   return ExitForStatus(parsed.status);
 }
 
+std::string OutputText(const char* text, const char* field) {
+  if (!text) return std::string();
+  return g_fileText ? (*g_fileText)(text, field) : std::string(text);
+}
+
 int ReportLosses(const char* command, const ParsedFile& parsed, int rc) {
+  if (g_fileText && !g_fileText->Report().empty())
+    std::fprintf(stderr, "ofxkit %s: %s\n", command, g_fileText->Report().c_str());
   if (!parsed.audit.complete)
     std::fprintf(stderr, "ofxkit %s: the file could not be checked for unread data (out of memory)\n", command);
   for (const ofxkit::AuditFinding& finding : parsed.audit.findings)
@@ -249,8 +269,8 @@ int ReportLosses(const char* command, const ParsedFile& parsed, int rc) {
   return parsed.audit.HasLoss() && rc == kClean ? kWarnings : rc;
 }
 
-std::string CsvText(const char* text, bool raw) {
-  std::string s(text ? text : "");
+std::string CsvText(const char* text, bool raw, const char* field) {
+  std::string s = OutputText(text, field);
   if (!raw && !s.empty() && std::strchr("=+-@\t\r", s[0])) s.insert(0, 1, '\'');
   if (s.find_first_of(",\"\r\n") == std::string::npos) return s;
   std::string quoted = "\"";

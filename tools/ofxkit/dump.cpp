@@ -19,6 +19,7 @@ const char kDumpHelp[] =
     "Exit status: 0 clean parse, 1 parsed with warnings, 2 parse failed, 3 unreadable\n"
     "or not OFX, 64 bad command line.\n";
 
+
 // One element value of an object, as the tree shows it.
 struct Element {
   OETagID tag;
@@ -41,19 +42,21 @@ std::vector<Element> ElementsOf(const OEDataObj* obj) {
       if (tag == OE_TAG_USERPASS || tag == OE_TAG_NEWUSERPASS) {
         out.push_back({tag, "(hidden)"});
       } else if (d->text(agg, k, text)) {
-        out.push_back({tag, text.c_str()});
+        out.push_back({tag, OutputText(text.c_str(), TagName(tag))});
       }
     }
   }
   return out;
 }
 
+const char* HeaderName(int32_t h) { return OEDataConversion::Text(static_cast<OEHeaderTag>(h)); }
+
 void HeadersOf(const OEDataObj* obj, std::vector<Element>& out) {
   const OEFileOFX* file = dynamic_cast<const OEFileOFX*>(obj);
   if (!file) return;
   for (int32_t h = OE_HEADER_OFXHEADER; h <= OE_HEADER_NEWFILEUID; ++h)
     if (const OEString* value = file->GetHeader(static_cast<OEHeaderTag>(h)))
-      out.push_back({static_cast<OETagID>(h), value->c_str()});
+      out.push_back({static_cast<OETagID>(h), OutputText(value->c_str(), HeaderName(h))});
 }
 
 // The children to show: the object's own, and a securities-list response
@@ -99,8 +102,6 @@ std::string JsonText(const std::string& bytes) {
 }
 
 std::string JsonText(const char* text) { return JsonText(std::string(text ? text : "")); }
-
-const char* HeaderName(int32_t h) { return OEDataConversion::Text(static_cast<OEHeaderTag>(h)); }
 
 void DumpText(const OEDataObj* obj, int depth, FILE* out) {
   std::string indent(static_cast<size_t>(depth) * 2, ' ');
@@ -156,7 +157,8 @@ void DumpJson(const OEDataObj* obj, FILE* out) {
 void WarningJson(const OEParseException& w, FILE* out) {
   std::fprintf(out, "{\"code\":%s,\"tag\":%s,\"value\":%s,\"position\":%d}",
                JsonText(OEParseException::WarningName(w.warning)).c_str(),
-               JsonText(w.tag ? TagName(w.tag) : w.tagName.c_str()).c_str(), JsonText(w.value.c_str()).c_str(),
+               JsonText(w.tag ? TagName(w.tag) : OutputText(w.tagName.c_str(), "a warning")).c_str(),
+               JsonText(OutputText(w.value.c_str(), "a warning")).c_str(),
                static_cast<int>(w.position));
 }
 
@@ -200,7 +202,8 @@ int CmdDump(int argc, char** argv) {
     for (unsigned short i = 0; i < log->Entries(); ++i) {
       const OEParseException* w = log->Get(i);
       std::fprintf(stdout, "  %s tag=%s value=\"%s\" position=%d\n", OEParseException::WarningName(w->warning),
-                   w->tag ? TagName(w->tag) : w->tagName.c_str(), w->value.c_str(), static_cast<int>(w->position));
+                   w->tag ? TagName(w->tag) : OutputText(w->tagName.c_str(), "a warning").c_str(),
+                   OutputText(w->value.c_str(), "a warning").c_str(), static_cast<int>(w->position));
     }
   }
   return ReportLosses("dump", parsed, rc);

@@ -1,6 +1,7 @@
 // ofxkit exchange: posts a request file to a server through the gateway
 // transport, saves the reply and dumps it.
 #include <signal.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cctype>
@@ -61,16 +62,54 @@ void PrintLogLine(const char* message, unsigned short level, const char*) {
   if (g_verbose) std::fprintf(stderr, "[%u] %s\n", level, message);
 }
 
-// One line, rewritten in place while the transfer runs.
+// Progress of the transfer: on a terminal one line rewritten in place; when
+// standard error is a file or a pipe, whole lines only, one per direction
+// when it completes (or where it stood when the transfer ended).
+struct Progress {
+  bool terminal = false;
+  bool shown = false;        // something is on the terminal's line
+  const char* verb = nullptr;  // direction of the last report
+  unsigned long done = 0, total = 0;
+  bool lineWritten = true;   // the last report already has its line
+} g_state;
+
+void WriteProgress(const char* prefix, const char* suffix) {
+  if (g_state.total)
+    std::fprintf(stderr, "%s%-8s %10lu of %lu bytes (%3lu%%)%s", prefix, g_state.verb, g_state.done, g_state.total,
+                 g_state.done * 100 / g_state.total, suffix);
+  else
+    std::fprintf(stderr, "%s%-8s %10lu bytes%s", prefix, g_state.verb, g_state.done, suffix);
+}
+
+// Ends the progress output with a line end, whatever was shown.
+void FinishProgress() {
+  if (!g_progress) return;
+  if (g_state.terminal) {
+    if (g_state.shown) std::fputc('\n', stderr);
+  } else if (!g_state.lineWritten && g_state.verb) {
+    WriteProgress("", "\n");
+  }
+  g_state.shown = false;
+  g_state.lineWritten = true;
+  std::fflush(stderr);
+}
+
 void PrintProgress(OEOpCode op, void* a, void* b) {
   if (!g_progress || (op != OE_OP_SEND_PROGRESS && op != OE_OP_RECEIVE_PROGRESS)) return;
-  auto done = static_cast<unsigned long>(reinterpret_cast<uintptr_t>(a));
-  auto total = static_cast<unsigned long>(reinterpret_cast<uintptr_t>(b));
   const char* verb = op == OE_OP_SEND_PROGRESS ? "sent" : "received";
-  if (total)
-    std::fprintf(stderr, "\r%-8s %10lu of %lu bytes (%3lu%%)", verb, done, total, done * 100 / total);
-  else
-    std::fprintf(stderr, "\r%-8s %10lu bytes               ", verb, done);
+  if (!g_state.terminal && g_state.verb && g_state.verb != verb && !g_state.lineWritten) WriteProgress("", "\n");
+  g_state.verb = verb;
+  g_state.done = static_cast<unsigned long>(reinterpret_cast<uintptr_t>(a));
+  g_state.total = static_cast<unsigned long>(reinterpret_cast<uintptr_t>(b));
+  if (g_state.terminal) {
+    WriteProgress("\r", g_state.total ? "" : "               ");
+    g_state.shown = true;
+  } else if (g_state.total && g_state.done >= g_state.total) {
+    WriteProgress("", "\n");
+    g_state.lineWritten = true;
+  } else {
+    g_state.lineWritten = false;
+  }
   std::fflush(stderr);
 }
 
@@ -130,6 +169,7 @@ int CmdExchange(int argc, char** argv) {
   bool builtIn = args.Flag("builtin-roots");
   bool noVerify = args.Flag("no-verify");
   g_progress = !args.Flag("quiet");
+  g_state.terminal = isatty(STDERR_FILENO) != 0;
   g_verbose = args.Flag("verbose");
   std::string timeout = args.HasOption("timeout") ? args.Option("timeout") : kDefaultTimeout;
   std::string output = args.Option("o");
@@ -193,7 +233,7 @@ int CmdExchange(int argc, char** argv) {
   status = OENetRequest::HasFileScheme(url.c_str()) ? request->Get(OEString(url.c_str()))
                                                      : request->Send(OEString(url.c_str()), &body);
   body.ClearBuffer('\0');
-  if (g_progress) std::fputc('\n', stderr);
+  FinishProgress();
   uint32_t http = 0, gatewayError = 0;
   request->GetStatus(http, gatewayError);
   OEBuffer reply;

@@ -32,7 +32,7 @@ std::string Text(const OEAggregate& obj, OETagID tag, const char* absent = "") {
   const OEFieldDesc* d = obj.FieldAt(tag);
   OEString text;
   if (!d || !d->text || !obj.ValidateTag(tag) || !d->text(&obj, 0, text)) return absent;
-  return text.c_str();
+  return OutputText(text.c_str(), TagName(tag));
 }
 
 std::string Join(const std::vector<std::string>& parts, const char* separator) {
@@ -48,7 +48,7 @@ std::string Join(const std::vector<std::string>& parts, const char* separator) {
 void PrintRealm(const OESignOnInfo& info) {
   const char* chars = info.ValidateTag(OE_TAG_CHARTYPE) ? OEDataConversion::Text(info.GetCharacterType()) : "?";
   std::printf("  %s: password of %s to %s characters, %s; %s; special characters %s; spaces %s;\n",
-              info.GetSignOnRealm().c_str(), Text(info, OE_TAG_MIN, "?").c_str(), Text(info, OE_TAG_MAX, "?").c_str(),
+              Text(info, OE_TAG_SIGNONREALM).c_str(), Text(info, OE_TAG_MIN, "?").c_str(), Text(info, OE_TAG_MAX, "?").c_str(),
               chars, info.GetCaseSensitive() ? "case-sensitive" : "not case-sensitive",
               info.GetSpecialChar() ? "allowed" : "not allowed", info.GetSpaceChar() ? "allowed" : "not allowed");
   std::printf("    PIN change %s; new PIN required at first sign-on: %s\n",
@@ -84,8 +84,8 @@ void PrintProfile(const OEProfileRs& rs) {
         continue;
       }
       std::printf("  %-18s version %s  %s  security %s, transport %s  realm %s\n", TagName(version->GetType()),
-                  Text(*core, OE_TAG_VER, "?").c_str(), core->GetURL().c_str(), Text(*core, OE_TAG_OFXSEC, "?").c_str(),
-                  Text(*core, OE_TAG_TRANSPSEC, "?").c_str(), core->GetSignOnRealm().c_str());
+                  Text(*core, OE_TAG_VER, "?").c_str(), Text(*core, OE_TAG_URL).c_str(), Text(*core, OE_TAG_OFXSEC, "?").c_str(),
+                  Text(*core, OE_TAG_TRANSPSEC, "?").c_str(), Text(*core, OE_TAG_SIGNONREALM).c_str());
     }
   }
   std::printf("sign-on realms:\n");

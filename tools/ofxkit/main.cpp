@@ -1,10 +1,16 @@
 // ofxkit: reads, writes and exchanges OFX files from the command line.
+#include <unistd.h>
+
 #include <cstdio>
 #include <cstring>
 
 #include "cli.h"
 
 namespace {
+// The network commands are loaded when they run (see net_loader.cpp).
+int Exchange(int argc, char** argv) { return cli::RunNetCommand("exchange", argc, argv); }
+int Serve(int argc, char** argv) { return cli::RunNetCommand("serve", argc, argv); }
+
 struct Command {
   const char* name;
   int (*run)(int, char**);
@@ -18,8 +24,8 @@ const Command kCommands[] = {
     {"accounts", cli::CmdAccounts, "print the accounts of an account-information response as CSV"},
     {"request", cli::CmdRequest, "write an OFX request file (request statement ...)"},
     {"respond", cli::CmdRespond, "answer a statement request file with a generated statement response"},
-    {"exchange", cli::CmdExchange, "post a request file to a server (http:, https:) and dump the reply"},
-    {"serve", cli::CmdServe, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
+    {"exchange", Exchange, "post a request file to a server (http:, https:) and dump the reply"},
+    {"serve", Serve, "answer OFX requests over HTTP or HTTPS on the loopback interface"},
     {"check", cli::CmdCheck, "print the warnings of a file's parse and every part of the file that was not read"},
 };
 
@@ -34,6 +40,10 @@ void Usage(FILE* out) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  // Into a file or a pipe, output goes in 64 KB writes rather than 4 KB ones
+  // (a large statement's dump is megabytes); a terminal keeps its lines.
+  static char outputBuffer[1 << 16];
+  if (!isatty(STDOUT_FILENO)) std::setvbuf(stdout, outputBuffer, _IOFBF, sizeof outputBuffer);
   if (argc < 2 || !std::strcmp(argv[1], "--help") || !std::strcmp(argv[1], "-h") || !std::strcmp(argv[1], "help")) {
     Usage(argc < 2 ? stderr : stdout);
     return argc < 2 ? cli::kUsage : cli::kClean;

@@ -65,9 +65,10 @@ int CmdStatement(int argc, char** argv) {
       if (!tx) continue;
       const char* type = tx->ValidateTag(OE_TAG_TRNTYPE) ? OEDataConversion::Text(tx->GetTxType()) : "";
       std::printf("%s%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), IsoDate(*tx).c_str(), Amount(*tx).c_str(),
-                  CsvText(type, raw).c_str(), CsvText(tx->GetFITId(), raw).c_str(),
-                  CsvText(tx->GetName(), raw).c_str(), CsvText(tx->GetMemo(), raw).c_str(),
-                  CsvText(tx->GetCheckNum(), raw).c_str());
+                  CsvText(type, raw).c_str(), CsvText(tx->GetFITId(), raw, "FITID").c_str(),
+                  CsvText(tx->GetName(), raw, "NAME").c_str(),
+                  CsvText(tx->GetMemo(), raw, "MEMO").c_str(),
+                  CsvText(tx->GetCheckNum(), raw, "CHEQUENUM").c_str());
     }
   }
   bool investments = PrintInvestmentTransactions(parsed.file.get(), withAccount, raw, !statements.empty());

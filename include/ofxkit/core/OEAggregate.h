@@ -355,18 +355,35 @@ unsigned short OESetValueField(OEAggregate* self, T& field, OETagID tag, const T
   return self->SetTag(tag);
 }
 
+// Traits whose conversion reports a code of its own that the setter passes
+// on (a status code out of its range is OEPW_TOOLONG) declare
+// `static constexpr bool kOwnFaultCode = true`.
+template <class Traits, class = void>
+struct OEKeepsOwnFaultCode : std::false_type {};
+template <class Traits>
+struct OEKeepsOwnFaultCode<Traits, std::void_t<decltype(Traits::kOwnFaultCode)>>
+    : std::integral_constant<bool, Traits::kOwnFaultCode> {};
+
+// Converts text quietly into value; answers the warning the setter logs:
+// 0 when the conversion succeeded, else OEPW_BADFORMAT, whatever code the
+// conversion itself reported (OEPW_OUTOFRANGE for a number that does not
+// fit, OEPW_TOOLONG for a language code), unless the traits keep their own.
+template <class Traits, class T>
+OEParseWarning OEConvertText(const OEString& text, T& value) {
+  OEQuietConversion quiet;
+  bool ok = Traits::FromText(text, value);
+  if (ok && !quiet.Faulted()) return OEPW_UNKNOWNEXCEPTION;
+  if (OEKeepsOwnFaultCode<Traits>::value && quiet.Faulted()) return quiet.Fault();
+  return OEPW_BADFORMAT;
+}
+
 // A typed element from text: converted quietly; a fault logs one warning
-// (the conversion's code, the text, the tag, the object) and leaves the field
-// and its presence bit as they were.
+// (OEPW_BADFORMAT, the text, the tag, the object) and leaves the field and
+// its presence bit as they were.
 template <class Traits, class T>
 unsigned short OESetFromText(OEAggregate* self, T& field, OETagID tag, const OEString& text) {
   T converted = field;
-  OEParseWarning fault;
-  {
-    OEQuietConversion quiet;
-    bool ok = Traits::FromText(text, converted);
-    fault = quiet.Faulted() ? quiet.Fault() : (ok ? OEPW_UNKNOWNEXCEPTION : OEPW_BADFORMAT);
-  }
+  OEParseWarning fault = OEConvertText<Traits>(text, converted);
   if (fault != OEPW_UNKNOWNEXCEPTION) {
     self->LogFieldFault(fault, tag, text);
     return 0;
@@ -423,12 +440,7 @@ template <class Traits, class T>
 unsigned short OESetValuesText(OEAggregate* self, OEDynamicArrayTyped<T>& list, unsigned short i, OETagID tag,
                                const OEString& text) {
   T value{};
-  OEParseWarning fault;
-  {
-    OEQuietConversion quiet;
-    bool ok = Traits::FromText(text, value);
-    fault = quiet.Faulted() ? quiet.Fault() : (ok ? OEPW_UNKNOWNEXCEPTION : OEPW_BADFORMAT);
-  }
+  OEParseWarning fault = OEConvertText<Traits>(text, value);
   if (fault != OEPW_UNKNOWNEXCEPTION) {
     self->LogFieldFault(fault, tag, text);
     return 0;

@@ -2,7 +2,9 @@
 // handlers through which parsers fill it and builders write it.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
+#include <new>
 
 #include "ofxkit/core/OETagID.h"
 #include "ofxkit/types/OECommon.h"
@@ -55,6 +57,20 @@ class OEDataObj {
   static OEDataObjFactory* GetFactory();
   // Reinstalls the library's default factory.
   static void ResetFactory();
+
+  // Objects are carved from large blocks of the library's own (2 MB, backed
+  // by huge pages where the system offers them) rather than taken one by one
+  // from the heap: a statement's tree is tens of thousands of objects, and
+  // this spares each its own allocation and most of them a fresh page.
+  // Freed objects are reused; blocks go back to the system when no object
+  // is left but for a few kept for the next parse. (Builds with
+  // AddressSanitizer use the heap, so that it sees every object.)
+  static void* operator new(std::size_t size);
+  static void* operator new(std::size_t size, const std::nothrow_t&) noexcept;
+  static void* operator new(std::size_t, void* where) noexcept { return where; }
+  static void operator delete(void* p, std::size_t size) noexcept;
+  static void operator delete(void* p, const std::nothrow_t&) noexcept;
+  static void operator delete(void*, void*) noexcept {}
 
  protected:
   OEParser* GetParser() const { return m_parser; }

@@ -11,6 +11,7 @@ struct OEStatusCodeTraits : OEPlainStore {
   using Type = int32_t;
   static constexpr int32_t kMin = -99999;
   static constexpr int32_t kMax = 999999;
+  static constexpr bool kOwnFaultCode = true;  // out of range is OEPW_TOOLONG
   static bool FromText(const OEString& text, int32_t& value);
   static OEBuildStatus Write(OEBuilder* b, OETagID tag, const int32_t& value) { return b->AddTagOESLong(tag, value); }
   static unsigned short ToText(const int32_t& value, OEString& out) { return OEValueText(value, out); }

@@ -46,6 +46,11 @@ class OEDynamicArrayParseException : public OEDynamicArrayTyped<OEParseException
 
 class OEParseLogger : public OEDynamicArrayParseException {
  public:
+  // An empty, enabled log of the application's own, for instance to keep the
+  // warnings of one parse (OEParser::CopyExceptionListTo) after the next
+  // parse clears the shared one.
+  OEParseLogger() : OEDynamicArrayParseException(1, 1) {}
+
   static OEParseLogger* TheOEParseLogger();
 
   unsigned short AppendParseException(OEParseWarning warning, OEString value, OEString tagName, OETagID tag,
@@ -67,9 +72,6 @@ class OEParseLogger : public OEDynamicArrayParseException {
   uint32_t GetReportCount() const { return m_reportCount; }
   OEParseWarning GetLastReported() const { return m_lastReported; }
   unsigned short DeepCopyFrom(OEParseLogger* from);
-
- protected:
-  OEParseLogger() : OEDynamicArrayParseException(1, 1) {}
 
  private:
   static OEParseLogger* ms_theOEParseLogger;

@@ -65,3 +65,29 @@ class OEBuffer {
   uint32_t m_size;
   uint32_t m_offset;
 };
+
+// A buffer whose ceiling is chosen when it is made instead of the fixed
+// 4,000,000 bytes, for documents of any size that positions can reach
+// (kMaxCeiling bytes, the reach of GetCh's signed 32-bit index).
+class OELargeBuffer : public OEBuffer {
+ public:
+  static constexpr uint32_t kMaxCeiling = 0x7FFFFFFF;
+
+  // Writes must end below ceiling (capped at kMaxCeiling), as they must end
+  // below 4,000,000 in a plain buffer.
+  explicit OELargeBuffer(uint32_t ceiling, uint32_t growBy = 0);
+
+ protected:
+  uint32_t GetMaxBufferSize() const override { return m_ceiling; }
+
+ private:
+  uint32_t m_ceiling;
+};
+
+// Reads a whole file into a new buffer sized for it (ceiling the file's size
+// plus one), ready to parse: offset 0, size the file's size. Answers null
+// when it cannot, with *error (when given) set to the errno value: the
+// file's own error, EFBIG for a file beyond OELargeBuffer::kMaxCeiling,
+// ENOMEM when the memory cannot be had, EIO for a failed read.
+OEBuffer* OEReadFileIntoBuffer(const char* path, int* error = nullptr);
+

@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 #include "ofxkit/types/OECommon.h"
 
@@ -14,6 +15,11 @@ enum OEStringEncode : int32_t {
 // The limit is advisory: a string keeps whatever it is given and only answers
 // whether it fits (IsValid, ExceedsSpecLength). Texts of 65535 characters or
 // more do not fit the 16-bit length and are refused (the string becomes null).
+//
+// Storage: the block (BufferSize bytes) lives inside the object while it is
+// at most kInlineBlock bytes, which holds most OFX texts (identifiers, names,
+// zone names), and on the heap beyond that; either way it behaves as one
+// block that grows to exact fit and never shrinks while text is held.
 class OEString {
  public:
   static constexpr unsigned short kNoLimit = 0xFFFF;
@@ -36,11 +42,11 @@ class OEString {
   void Append(const char* text, size_t length);
   void Clear(char c);
 
-  operator const char*() const { return m_text ? m_text : ""; }
-  const char* c_str() const { return m_text ? m_text : ""; }
+  operator const char*() const { return m_bufferSize ? Block() : ""; }
+  const char* c_str() const { return m_bufferSize ? Block() : ""; }
   unsigned short GetStrLength() const { return m_length; }
   unsigned short BufferSize() const { return m_bufferSize; }
-  unsigned short IsNull() const { return m_text == nullptr; }
+  unsigned short IsNull() const { return m_bufferSize == 0; }
   unsigned short IsEmpty() const { return m_length == 0; }
   unsigned short SpecLength() const { return m_specLength; }
   unsigned short ExceedsSpecLength() const { return m_specLength < m_length; }
@@ -74,15 +80,31 @@ class OEString {
   // the subclasses that keep their own limit.
   void AssignTextAndEncoding(const OEString& other);
 
+ public:
+  // Blocks of up to this many bytes are held inside the string.
+  static constexpr unsigned short kInlineBlock = 30;
+
  private:
   bool EnsureRoom(size_t n);
   void Release();
+  bool IsInline() const { return m_bufferSize <= kInlineBlock; }
+  char* HeapBlock() const {
+    char* p;
+    memcpy(&p, m_store, sizeof p);
+    return p;
+  }
+  void SetHeapBlock(char* p) { memcpy(m_store, &p, sizeof p); }
+  // The block; meaningful only while BufferSize() is not 0.
+  char* Block() { return IsInline() ? m_store : HeapBlock(); }
+  const char* Block() const { return IsInline() ? m_store : HeapBlock(); }
+  void TakeStorage(OEString& other);
 
-  unsigned short m_specLength;
-  char* m_text;
-  unsigned short m_bufferSize;
-  unsigned short m_length;
   OEStringEncode m_encoding;
+  unsigned short m_specLength;
+  unsigned short m_bufferSize;  // 0: null string; up to kInlineBlock: inline
+  unsigned short m_length;
+  // The inline block, or the heap block's address once it is larger.
+  char m_store[kInlineBlock];
 };
 
 OEString operator+(const OEString& a, const OEString& b);
