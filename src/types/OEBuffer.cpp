@@ -1,5 +1,6 @@
 #include "ofxkit/types/OEBuffer.h"
 
+#include <sys/stat.h>
 #if defined(__linux__)
 #include <sys/mman.h>
 #endif
@@ -216,6 +217,51 @@ void SetError(int* error, int value) {
 }
 }  // namespace
 
+namespace {
+// A regular file of a known size, read at once into a buffer of that size.
+OEBuffer* ReadSized(FILE* f, uint32_t length, int* failure) {
+  OEBuffer* buffer = new (std::nothrow) OELargeBuffer(length + 1);
+  if (!buffer || buffer->AllocateTo(length + 1) != OEBUF_OK || !buffer->GetBufferPtr()) {
+    *failure = ENOMEM;
+    return buffer;
+  }
+#if defined(__linux__)
+  // Megabytes of text: let the kernel back them with huge pages where it
+  // offers them, rather than fault them in 4 KB at a time.
+  constexpr uintptr_t kHuge = uintptr_t{2} << 20;
+  uintptr_t start = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + kHuge - 1) & ~(kHuge - 1);
+  uintptr_t end = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + length) & ~(kHuge - 1);
+  if (end > start) madvise(reinterpret_cast<void*>(start), end - start, MADV_HUGEPAGE);
+#endif
+  size_t got = length ? fread(buffer->GetBufferPtr(), 1, length, f) : 0;
+  // A file that changed size under us: what was read is what there is.
+  if (got != length && ferror(f)) *failure = EIO;
+  if (got) buffer->SetBufferSize(static_cast<uint32_t>(got));
+  return buffer;
+}
+
+// A pipe or a device: read to its end, the buffer growing a megabyte at a time.
+OEBuffer* ReadStream(FILE* f, int* failure) {
+  OEBuffer* buffer = new (std::nothrow) OELargeBuffer(OELargeBuffer::kMaxCeiling, 1u << 20);
+  if (!buffer || !buffer->GetBufferPtr()) {
+    *failure = ENOMEM;
+    return buffer;
+  }
+  char chunk[OEBuffer::kChunk];
+  size_t n;
+  while ((n = fread(chunk, 1, sizeof chunk, f)) > 0) {
+    OEBufferResult r = buffer->WriteLarge(chunk, static_cast<uint32_t>(n));
+    if (r != OEBUF_OK) {
+      *failure = r == OEBUF_OUTOFRANGE ? EFBIG : ENOMEM;
+      return buffer;
+    }
+  }
+  if (ferror(f)) *failure = EIO;
+  buffer->SetBufferOffset(0);
+  return buffer;
+}
+}  // namespace
+
 OEBuffer* OEReadFileIntoBuffer(const char* path, int* error) {
   SetError(error, 0);
   FILE* f = path ? fopen(path, "rb") : nullptr;
@@ -225,31 +271,17 @@ OEBuffer* OEReadFileIntoBuffer(const char* path, int* error) {
   }
   OEBuffer* buffer = nullptr;
   int failure = 0;
-  long size = -1;
-  if (fseek(f, 0, SEEK_END) == 0) size = ftell(f);
-  if (size < 0 || fseek(f, 0, SEEK_SET) != 0) {
-    failure = errno ? errno : EIO;  // not a regular file (a pipe, a directory)
-  } else if (static_cast<unsigned long>(size) >= OELargeBuffer::kMaxCeiling) {
+  struct stat info;
+  if (fstat(fileno(f), &info) != 0) {
+    failure = errno ? errno : EIO;
+  } else if (S_ISDIR(info.st_mode)) {
+    failure = EISDIR;
+  } else if (!S_ISREG(info.st_mode)) {
+    buffer = ReadStream(f, &failure);
+  } else if (static_cast<unsigned long long>(info.st_size) >= OELargeBuffer::kMaxCeiling) {
     failure = EFBIG;
   } else {
-    uint32_t length = static_cast<uint32_t>(size);
-    buffer = new (std::nothrow) OELargeBuffer(length + 1);
-    if (!buffer || buffer->AllocateTo(length + 1) != OEBUF_OK || !buffer->GetBufferPtr()) {
-      failure = ENOMEM;
-    } else {
-#if defined(__linux__)
-      // Megabytes of text: let the kernel back them with huge pages where it
-      // offers them, rather than fault them in 4 KB at a time.
-      constexpr uintptr_t kHuge = uintptr_t{2} << 20;
-      uintptr_t start = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + kHuge - 1) & ~(kHuge - 1);
-      uintptr_t end = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + length) & ~(kHuge - 1);
-      if (end > start) madvise(reinterpret_cast<void*>(start), end - start, MADV_HUGEPAGE);
-#endif
-      size_t got = length ? fread(buffer->GetBufferPtr(), 1, length, f) : 0;
-      // A file that changed size under us: what was read is what there is.
-      if (got != length && ferror(f)) failure = EIO;
-      if (got) buffer->SetBufferSize(static_cast<uint32_t>(got));
-    }
+    buffer = ReadSized(f, static_cast<uint32_t>(info.st_size), &failure);
   }
   fclose(f);
   if (failure) {

@@ -72,6 +72,12 @@ check "missing file: status 3" 3 "$?"
 check "missing file: one line" "1 1" "$(wc -l < "$work/missing.err") $(grep -c 'missing.ofx: No such file' "$work/missing.err")"
 check "missing file: ends with a line end" "0a" "$(tail -c 1 "$work/missing.err" | od -An -tx1 | tr -d ' ')"
 
+# A directory is named as one; a pipe is read to its end.
+$ofxkit dump "$work" > /dev/null 2> "$work/dir.err"
+check "directory: status 3 and its reason" "3 1" "$? $(grep -c ': Is a directory$' "$work/dir.err")"
+cat "$work/cp1252.ofx" | $ofxkit statement /dev/stdin > "$work/piped.csv" 2> /dev/null
+check "a pipe read as a file" "0 3" "${PIPESTATUS[1]} $(wc -l < "$work/piped.csv")"
+
 # exchange's progress when standard error is not a terminal: whole lines,
 # one per direction, no carriage returns running them together.
 echo "pa55word" | $ofxkit request statement --org "Demo Bank" --fid 1234 --user alice --password-stdin \

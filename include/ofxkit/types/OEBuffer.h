@@ -85,9 +85,10 @@ class OELargeBuffer : public OEBuffer {
 };
 
 // Reads a whole file into a new buffer sized for it (ceiling the file's size
-// plus one), ready to parse: offset 0, size the file's size. Answers null
-// when it cannot, with *error (when given) set to the errno value: the
-// file's own error, EFBIG for a file beyond OELargeBuffer::kMaxCeiling,
-// ENOMEM when the memory cannot be had, EIO for a failed read.
+// plus one), ready to parse: offset 0, size the file's size. A pipe or a
+// device is read to its end. Answers null when it cannot, with *error (when
+// given) set to the errno value: the file's own error, EISDIR for a
+// directory, EFBIG for a file beyond OELargeBuffer::kMaxCeiling, ENOMEM when
+// the memory cannot be had, EIO for a failed read.
 OEBuffer* OEReadFileIntoBuffer(const char* path, int* error = nullptr);
 
