@@ -449,6 +449,63 @@ TEST_F(MovingMoneyTest, StatementClosingsInDocumentOrder) {
   EXPECT_EQ(ccrs->GetCCClosing(0)->GetMinimumPaymentDue(), OEPrecisionInteger("25"));
 }
 
+TEST_F(MovingMoneyTest, SingleAccountFormsOfTheListsAndAccounts) {
+  OEPayeeRq rq;
+  EXPECT_EQ(rq.GetPayAccount(), "");
+  ASSERT_EQ(rq.SetPayAccount(OEString("ACC-1")), 1);
+  EXPECT_EQ(rq.GetPayAccount(), "ACC-1");
+  ASSERT_EQ(rq.AppendPayAccount(OEString("ACC-2")), 1);
+  EXPECT_EQ(rq.GetNumPayAccount(), 2);
+  rq.SetPayeeID(OEString("P-1"));
+  EXPECT_EQ(Write(rq), "<PAYEERQ><PAYEEID>P-1<PAYACCT>ACC-1<PAYACCT>ACC-2</PAYEERQ>");
+
+  OECCStatementEndRs cc;
+  auto* card = new OECCAccount;
+  card->SetAccountID(OEString("4111"));
+  ASSERT_EQ(cc.SetAccountFrom(card), 1);
+  cc.SetCurrencyDefault(OEString("USD"));
+  EXPECT_EQ(cc.AllRequiredPresent(), 1);
+  EXPECT_EQ(Write(cc), "<CCSTMTENDRS><CURDEF>USD<CCACCTFROM><ACCTID>4111</CCACCTFROM></CCSTMTENDRS>");
+
+  OEStatementEndRq end;
+  auto* bank = new OEBankAccount;
+  ASSERT_EQ(end.SetAccountFrom(bank), 1);
+  EXPECT_EQ(end.GetAcctFrom(), bank);
+  EXPECT_EQ(end.SetDateTimeStart(OEString("20240101")), 1);
+  EXPECT_EQ(end.SetDateTimeEnd(OEString("not a date")), 0);
+  EXPECT_FALSE(end.ValidateTag(OE_TAG_DTEND));
+}
+
+// Answers as servers send them: unknown extension tags, elements closed and
+// unclosed, an aggregate cut short. Nothing crashes and what was read stays.
+TEST_F(MovingMoneyTest, UntidyServerAnswersKeepWhatTheyCarry) {
+  const std::string text =
+      "<OFX><BILLPAYMSGSRSV1><PMTTRNRS><TRNUID>9<STATUS><CODE>0<SEVERITY>INFO</STATUS><PMTRS>"
+      "<PMTINFO><BANKACCTFROM><BANKID>121000248</BANKID><ACCTID>1001<ACCTTYPE>CHECKING</BANKACCTFROM>"
+      "<PAYEEID>P-1</PAYEEID><INTU.PAYEENAME>Water</INTU.PAYEENAME><TRNAMT>12.00<PAYACCT>9<DTDUE>20240120120000.000"
+      "[-5:EST]</PMTINFO><PMTPRCSTS><PMTPRCCODE>PROCESSEDON<DTPMTPRC>20240120</PMTPRCSTS><SRVRTID>S9"
+      "<PAYEELSTID>L9<CURDEF>USD</PMTRS></PMTTRNRS><RECPMTTRNRS><TRNUID>10<STATUS><CODE>2000"
+      "<SEVERITY>ERROR<MESSAGE>no such model</STATUS></RECPMTTRNRS></BILLPAYMSGSRSV1>"
+      "<BANKMSGSRSV1><STPCHKTRNRS><TRNUID>11<STATUS><CODE>0<SEVERITY>INFO</STATUS><STPCHKRS><CURDEF>USD"
+      "<BANKACCTFROM><BANKID>1<ACCTID>2<ACCTTYPE>CHECKING</BANKACCTFROM><STPCHKNUM><CHEQUENUM>7<CHKSTATUS>0";
+  OEResponse response;
+  OEParseStatus status = ParseText(text, &response);
+  EXPECT_NE(status, OE_PARSE_OK);
+  ASSERT_GE(response.GetNumMessage(), 1);
+  OETransRs* payment = response.GetMessageSet(0)->GetTrans(0);
+  ASSERT_NE(payment, nullptr);
+  auto* rs = dynamic_cast<OEPaymentRs*>(payment->GetActualTrans());
+  ASSERT_NE(rs, nullptr);
+  EXPECT_EQ(rs->GetPaymentInfo()->GetPayeeID(), "P-1");
+  EXPECT_EQ(rs->GetPaymentInfo()->GetBankAcctFrom()->GetAccountID(), "1001");
+  EXPECT_EQ(rs->GetPaymentPrcSts()->GetProcessingCode(), OE_PROCCODE_PROCESSEDON);
+  EXPECT_EQ(rs->AllRequiredPresent(), 1);
+  // The error answer needs no recurring payment.
+  OETransRs* failed = response.GetMessageSet(0)->GetTrans(1);
+  ASSERT_NE(failed, nullptr);
+  EXPECT_EQ(failed->AllRequiredPresent(), 1);
+}
+
 // ---------------------------------------------------------------------------
 // Through the wrappers
 

@@ -2,6 +2,12 @@
 
 OE_DEFINE_AGGREGATE(OEPayeeBase, OETransBase, OE_PAYEEBASE_FIELDS, NONE, )
 
+const OEString32& OEPayeeBase::GetPayAccount() const {
+  static const OEString32 kNone;
+  const OEString32* first = GetPayAccount(0);
+  return first ? *first : kNone;
+}
+
 // A payee from the standard list is named by its id alone; any other comes
 // with its address (and perhaps the account it is paid into).
 OE_DEFINE_AGGREGATE(OEPayeeRq, OEPayeeBase, OE_PAYEERQ_FIELDS, PAYEERQ,

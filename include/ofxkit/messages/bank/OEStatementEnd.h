@@ -84,7 +84,7 @@ class OEStatementEndRs : public OETransBase {
 };
 
 #define OE_CCSTATEMENTENDRS_FIELDS(X)                     \
-  X(CHILD, CCAccountFrom, CCACCTFROM, OECCAccount)        \
+  X(CHILD, AccountFrom, CCACCTFROM, OECCAccount)          \
   X(LIST, CCClosing, CCCLOSING, OECCClosing)              \
   X(TEXT, CurrencyDefault, CURDEF, OEString3)
 

@@ -17,6 +17,11 @@
 class OEPayeeBase : public OETransBase {
   OE_AGGREGATE(OEPayeeBase, OE_PAYEEBASE_FIELDS)
   using OETransBase::DeepCopyFrom;
+
+  // For payers with one account at the payee: the first account number
+  // (empty when there is none), and setting it.
+  const OEString32& GetPayAccount() const;
+  unsigned short SetPayAccount(const OEString& text) { return SetPayAccount(0, text); }
 };
 
 // A new payee: from the institution's standard list by id, or by address.
