@@ -559,4 +559,89 @@ TEST_F(MovingMoneyTest, WrappersCarryTheNewRequestsAndResponses) {
       << written;
 }
 
+
+// A request file as an application makes one: a transfer in the bank set, a
+// payment and a new payee in the bill-pay set, checked and read back whole.
+TEST_F(MovingMoneyTest, RequestFileOfTransferAndPaymentRoundTrips) {
+  auto wrap = [](OETagID type, const char* id, OETransBase* inner) {
+    auto* t = new OETransRq;
+    t->SetType(type);
+    t->SetTransUserID(OEString(id));
+    EXPECT_EQ(t->SetActualTrans(inner), 1);
+    t->SetTag(inner->GetType());  // the wrapper's rule reads the inner tag's bit
+    return t;
+  };
+  auto* bankFrom = new OEBankAccount;
+  bankFrom->SetBankID(OEString("121000248"));
+  bankFrom->SetAccountID(OEString("1001"));
+  bankFrom->SetAccountType(OEString("CHECKING"));
+  auto* bankTo = new OEBankAccount;
+  bankTo->SetBankID(OEString("121000248"));
+  bankTo->SetAccountID(OEString("2002"));
+  bankTo->SetAccountType(OEString("SAVINGS"));
+  auto* intra = new OEIntraRq;
+  OEXferInfo* info = intra->GetXferInfo(1);
+  ASSERT_EQ(info->SetAccountFrom(bankFrom), 1);
+  ASSERT_EQ(info->SetAccountTo(bankTo), 1);
+  info->SetTranAmount(OEString("250.00"));
+  info->SetDateDue(OEString("20240115"));
+
+  auto* payment = new OEPaymentRq;
+  OEPaymentInfo* pmt = payment->GetPaymentInfo(1);
+  auto* payFrom = new OEBankAccount;
+  payFrom->SetBankID(OEString("121000248"));
+  payFrom->SetAccountID(OEString("1001"));
+  payFrom->SetAccountType(OEString("CHECKING"));
+  ASSERT_EQ(pmt->SetBankAcctFrom(payFrom), 1);
+  pmt->SetTranAmount(OEString("123.45"));
+  pmt->SetPayeeID(OEString("P-1"));
+  pmt->SetPayAccount(OEString("ACC-9"));
+  pmt->SetDateDue(OEString("20240120"));
+  pmt->SetMemo(OEString("January"));
+  auto* payee = new OEPayeeRq;
+  payee->SetPayeeID(OEString("P-2"));
+
+  OERequest request;
+  auto* bank = new OEMessageSetRq;
+  bank->SetType(OE_TAG_BANKMSGSRQV1);
+  bank->AppendTrans(wrap(OE_TAG_INTRATRNRQ, "T-1", intra));
+  auto* billpay = new OEMessageSetRq;
+  billpay->SetType(OE_TAG_BILLPAYMSGSRQV1);
+  billpay->AppendTrans(wrap(OE_TAG_PMTTRNRQ, "T-2", payment));
+  billpay->AppendTrans(wrap(OE_TAG_PAYEETRNRQ, "T-3", payee));
+  ASSERT_EQ(request.AppendMessageSet(billpay), 1);
+  ASSERT_EQ(request.AppendMessageSet(bank), 1);
+
+  // (The request itself would also want a sign-on; the sets are checked.)
+  OETagID missing = OE_TAG_NONE;
+  OEDataObj* where = bank;
+  EXPECT_EQ(OEUtility::AllRequiredPresent(&where, &missing), 1);
+  where = billpay;
+  EXPECT_EQ(OEUtility::AllRequiredPresent(&where, &missing), 1);
+  WrittenText strict = WriteUnderOwnTag(request, OE_BUILD_STRICT);
+  ASSERT_EQ(strict.status, OE_BUILD_OK);
+  EXPECT_LT(strict.text.find("<BANKMSGSRQV1>"), strict.text.find("<BILLPAYMSGSRQV1>"));
+  const std::string written = Write(request);
+  EXPECT_NE(written.find("<INTRATRNRQ><TRNUID>T-1<INTRARQ><XFERINFO><BANKACCTFROM><BANKID>121000248<ACCTID>1001"
+                         "<ACCTTYPE>CHECKING</BANKACCTFROM><BANKACCTTO><BANKID>121000248<ACCTID>2002"
+                         "<ACCTTYPE>SAVINGS</BANKACCTTO><TRNAMT>250.00<DTDUE>"),
+            std::string::npos)
+      << written;
+  EXPECT_NE(written.find("<PMTINFO><BANKACCTFROM><BANKID>121000248<ACCTID>1001<ACCTTYPE>CHECKING</BANKACCTFROM>"
+                         "<TRNAMT>123.45<PAYEEID>P-1<PAYACCT>ACC-9<DTDUE>"),
+            std::string::npos)
+      << written;
+
+  OERequest again;
+  ASSERT_EQ(ParseText(strict.text, &again), OE_PARSE_OK);
+  EXPECT_EQ(Write(again), written);
+
+  // A payment that names no payee is found by the check, at its PMTINFO.
+  pmt->ClearTagQuietly(OE_TAG_PAYEEID);
+  where = billpay;
+  EXPECT_EQ(OEUtility::AllRequiredPresent(&where, &missing), 0);
+  EXPECT_EQ(where, pmt);
+  EXPECT_EQ(missing, OE_TAG_PAYEEID);
+}
+
 }  // namespace
