@@ -644,4 +644,50 @@ TEST_F(MovingMoneyTest, RequestFileOfTransferAndPaymentRoundTrips) {
   EXPECT_EQ(missing, OE_TAG_PAYEEID);
 }
 
+
+// Every inner request and response of the moving-money wrappers is made by
+// the factory as the class of its own tag, and an application's factory is
+// the one a parse uses.
+TEST_F(MovingMoneyTest, InnerAggregatesAreMadeForTheirTags) {
+  const OETagID inner[] = {
+      OE_TAG_INTRARQ,      OE_TAG_INTRAMODRQ,    OE_TAG_INTRACANRQ,    OE_TAG_INTRARS,       OE_TAG_INTRAMODRS,
+      OE_TAG_INTRACANRS,   OE_TAG_RECINTRARQ,    OE_TAG_RECINTRAMODRQ, OE_TAG_RECINTRACANRQ, OE_TAG_RECINTRARS,
+      OE_TAG_RECINTRAMODRS, OE_TAG_RECINTRACANRS, OE_TAG_INTERRQ,      OE_TAG_INTERMODRQ,    OE_TAG_INTERCANRQ,
+      OE_TAG_INTERRS,      OE_TAG_INTERMODRS,    OE_TAG_INTERCANRS,    OE_TAG_RECINTERRQ,    OE_TAG_RECINTERMODRQ,
+      OE_TAG_RECINTERCANRQ, OE_TAG_RECINTERRS,   OE_TAG_RECINTERMODRS, OE_TAG_RECINTERCANRS, OE_TAG_WIRERQ,
+      OE_TAG_WIRECANRQ,    OE_TAG_WIRERS,        OE_TAG_WIRECANRS,     OE_TAG_PAYEERQ,       OE_TAG_PAYEEMODRQ,
+      OE_TAG_PAYEEDELRQ,   OE_TAG_PAYEERS,       OE_TAG_PAYEEMODRS,    OE_TAG_PAYEEDELRS,    OE_TAG_PMTRQ,
+      OE_TAG_PMTMODRQ,     OE_TAG_PMTCANCRQ,     OE_TAG_PMTRS,         OE_TAG_PMTMODRS,      OE_TAG_PMTCANCRS,
+      OE_TAG_RECPMTRQ,     OE_TAG_RECPMTMODRQ,   OE_TAG_RECPMTCANCRQ,  OE_TAG_RECPMTRS,      OE_TAG_RECPMTMODRS,
+      OE_TAG_RECPMTCANCRS, OE_TAG_PMTINQRQ,      OE_TAG_PMTINQRS,      OE_TAG_STPCHKRQ,      OE_TAG_STPCHKRS,
+      OE_TAG_STMTENDRQ,    OE_TAG_STMTENDRS,     OE_TAG_CCSTMTENDRQ,   OE_TAG_CCSTMTENDRS};
+  OEDataObjFactory factory;
+  for (OETagID tag : inner) {
+    std::unique_ptr<OETransBase> made(OENewInnerTrans(&factory, tag));
+    ASSERT_NE(made, nullptr) << tag;
+    EXPECT_EQ(made->GetType(), tag);
+    // Its own tag's class takes exactly the tags of its row.
+    OEArrayOfTags valid{nullptr, 0};
+    EXPECT_EQ(made->GetArrayOfValidTags(valid), 1);
+    EXPECT_GT(valid.count, 0);
+  }
+
+  struct Counting : OEDataObjFactory {
+    int made = 0;
+    OEIntraRq* NewIntraRq() override {
+      ++made;
+      return OEDataObjFactory::NewIntraRq();
+    }
+  } counting;
+  OEDataObjFactory* before = OEDataObj::GetFactory();
+  OEDataObj::SetFactory(&counting);
+  OERequest request;
+  const std::string text = "<OFX><BANKMSGSRQV1><INTRATRNRQ><TRNUID>1<INTRARQ>" +
+                           XferInfo(std::string(kChecking) + kSavingsTo) +
+                           "</INTRARQ></INTRATRNRQ></BANKMSGSRQV1></OFX>";
+  EXPECT_EQ(ParseText(text, &request), OE_PARSE_OK);
+  OEDataObj::SetFactory(before);
+  EXPECT_EQ(counting.made, 1);
+}
+
 }  // namespace
