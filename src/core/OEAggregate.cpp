@@ -85,6 +85,21 @@ OEAggregateInfo& OEAggregateInfo::ExactlyOneOf(std::initializer_list<OETagID> ta
   return *this;
 }
 
+OEAggregateInfo& OEAggregateInfo::Alternatives(std::initializer_list<OETagID> tags) {
+  alternatives.emplace_back(tags);
+  return *this;
+}
+
+OEAggregateInfo& OEAggregateInfo::Excludes(OETagID first, OETagID second) {
+  excludes.push_back(Pair{first, second});
+  return *this;
+}
+
+OEAggregateInfo& OEAggregateInfo::RequiresIf(OETagID present, OETagID needed) {
+  requiresIf.push_back(Pair{present, needed});
+  return *this;
+}
+
 const OEFieldDesc* OEAggregateInfo::FindField(OETagID tag) const {
   for (const OEAggregateInfo* info = this; info; info = info->parent)
     for (const OEFieldDesc& d : info->fields)
@@ -224,6 +239,12 @@ unsigned short OEAggregate::AllRequiredPresent() {
     if (ValidateTag(pair.first) && ValidateTag(pair.second)) return 0;
   for (const std::vector<OETagID>& choice : info.exactlyOne)
     if (PresentAmong(choice) != 1) return 0;
+  for (const std::vector<OETagID>& choice : info.alternatives)
+    if (PresentAmong(choice) != 1) return 0;
+  for (const OEAggregateInfo::Pair& pair : info.excludes)
+    if (ValidateTag(pair.first) && ValidateTag(pair.second)) return 0;
+  for (const OEAggregateInfo::Pair& pair : info.requiresIf)
+    if (ValidateTag(pair.first) && !ValidateTag(pair.second)) return 0;
   return 1;
 }
 
@@ -233,29 +254,31 @@ unsigned short OEAggregate::PresentAmong(const std::vector<OETagID>& tags) const
   return n;
 }
 
-// The missing tags are the absent required tags in order, then, for each
-// pair of which neither is present, the first of the pair. Each answer is
-// the missing tag that follows `after` in that sequence.
+// The missing tags are, in this order: the absent required tags; for each
+// pair of which neither is present, the first of the pair; for each
+// exactly-one choice with none present, its first tag; for each set of
+// alternatives with none present, every alternative; for each tag that needs
+// another, the other when it is absent. Each answer is the missing tag that
+// follows `after` in that sequence (the first one when `after` is 0).
 OETagID OEAggregate::GetFirstMissingRequiredTag(OETagID after) const {
-  OETagID answer = OEDataObj::GetFirstMissingRequiredTag(after);
-  if (answer != OE_TAG_NONE) return answer;
-  bool passed = after == OE_TAG_NONE;
-  if (!passed) {
-    // `after` may itself be the last absent required tag: then the pairs follow.
-    OEArrayOfTags required{nullptr, 0};
-    GetArrayOfRequiredTags(required);
+  const OEAggregateInfo& info = GetInfo();
+  std::vector<OETagID> missing;
+  OEArrayOfTags required{nullptr, 0};
+  if (GetArrayOfRequiredTags(required) && required.tags)
     for (unsigned short i = 0; i < required.count; ++i)
-      if (required.tags[i] == after && !ValidateTag(after)) passed = true;
-  }
-  for (const OEAggregateInfo::Pair& pair : GetInfo().oneOf) {
-    if (ValidateTag(pair.first) || ValidateTag(pair.second)) continue;
-    if (passed) return pair.first;
-    if (pair.first == after) passed = true;
-  }
-  for (const std::vector<OETagID>& choice : GetInfo().exactlyOne) {
-    if (choice.empty() || PresentAmong(choice) != 0) continue;
-    if (passed) return choice.front();
-    if (choice.front() == after) passed = true;
+      if (!ValidateTag(required.tags[i])) missing.push_back(required.tags[i]);
+  for (const OEAggregateInfo::Pair& pair : info.oneOf)
+    if (!ValidateTag(pair.first) && !ValidateTag(pair.second)) missing.push_back(pair.first);
+  for (const std::vector<OETagID>& choice : info.exactlyOne)
+    if (!choice.empty() && PresentAmong(choice) == 0) missing.push_back(choice.front());
+  for (const std::vector<OETagID>& choice : info.alternatives)
+    if (PresentAmong(choice) == 0) missing.insert(missing.end(), choice.begin(), choice.end());
+  for (const OEAggregateInfo::Pair& pair : info.requiresIf)
+    if (ValidateTag(pair.first) && !ValidateTag(pair.second)) missing.push_back(pair.second);
+  bool passed = after == OE_TAG_NONE;
+  for (OETagID tag : missing) {
+    if (passed) return tag;
+    passed = tag == after;
   }
   return OE_TAG_NONE;
 }

@@ -39,7 +39,10 @@
 // presence bits), .Required(tags), .WriteOrder(tags) when children and
 // elements are written in another order, .OneOf(a, b) for a pair of which at
 // most one may be present and one is expected, .ExactlyOneOf(tags) for a
-// choice of which exactly one must be present. A class may inherit fields from
+// choice of which exactly one must be present, .Alternatives(tags) for such a
+// choice whose every alternative is reported missing, .Excludes(a, b) for two
+// tags that may not stand together, .RequiresIf(a, b) for a tag that needs
+// another. A class may inherit fields from
 // a family base; its valid tags choose which of them it uses.
 //
 // From that, OEAggregate supplies parsing (HandleTagElement, HandleTagStart),
@@ -232,6 +235,14 @@ class OEAggregateInfo {
   // Exactly one of the tags must be present (a choice the aggregate cannot
   // do without); the first is reported missing when none is.
   OEAggregateInfo& ExactlyOneOf(std::initializer_list<OETagID> tags);
+  // Exactly one of the tags must be present; when none is, each of them is
+  // reported missing in turn, so that a caller walking the missing tags
+  // hears of every alternative (a payment to a payee by id or by address).
+  OEAggregateInfo& Alternatives(std::initializer_list<OETagID> tags);
+  // The two tags may not both be present; neither is ever reported missing.
+  OEAggregateInfo& Excludes(OETagID first, OETagID second);
+  // When `present` is present, `needed` must be too (and is reported missing).
+  OEAggregateInfo& RequiresIf(OETagID present, OETagID needed);
 
   // Fills in the per-position lookup; called once when the info is complete.
   const OEAggregateInfo& Finish();
@@ -247,6 +258,9 @@ class OEAggregateInfo {
   };
   std::vector<Pair> oneOf;
   std::vector<std::vector<OETagID>> exactlyOne;
+  std::vector<std::vector<OETagID>> alternatives;
+  std::vector<Pair> excludes;
+  std::vector<Pair> requiresIf;  // first present needs second
   // Per valid position: the field that takes the tag (null for none), and
   // whether that position writes the member (its first tag in write order).
   std::vector<const OEFieldDesc*> byPosition;
