@@ -1,5 +1,6 @@
 #include "ofxkit/core/OEAggregate.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstring>
 
@@ -122,6 +123,16 @@ bool IsChildKind(const OEFieldDesc* d) { return d->kind == OE_FIELD_CHILD || d->
 }  // namespace
 
 const OEAggregateInfo& OEAggregateInfo::Finish() {
+  positionOf.clear();
+  if (!valid.empty() && valid.size() < 255) {
+    uint32_t low = *std::min_element(valid.begin(), valid.end());
+    uint32_t high = *std::max_element(valid.begin(), valid.end());
+    if (high - low < 4096) {
+      firstTag = static_cast<OETagID>(low);
+      positionOf.assign(high - low + 1, 0);
+      for (size_t i = valid.size(); i-- > 0;) positionOf[valid[i] - low] = static_cast<uint8_t>(i + 1);
+    }
+  }
   byPosition.clear();
   for (OETagID tag : valid) byPosition.push_back(FindField(tag));
 
@@ -147,6 +158,14 @@ const OEAggregateInfo& OEAggregate::ClassInfo() {
   static OEAggregateInfo info(nullptr, {}, OE_TAG_NONE);
   static const OEAggregateInfo& finished = info.Finish();
   return finished;
+}
+
+int32_t OEAggregate::ValidTagPosition(OETagID tag) const {
+  const OEAggregateInfo& info = GetInfo();
+  if (info.positionOf.empty()) return OEDataObj::ValidTagPosition(tag);
+  uint32_t k = static_cast<uint32_t>(tag) - static_cast<uint32_t>(info.firstTag);
+  int32_t position = k < info.positionOf.size() ? static_cast<int32_t>(info.positionOf[k]) - 1 : -1;
+  return position < kMaxValidTags ? position : -1;
 }
 
 const OEFieldDesc* OEAggregate::FieldAt(OETagID tag) const {

@@ -268,6 +268,11 @@ class OEAggregateInfo {
   std::vector<OETagID> writeTags;
   std::vector<const OEFieldDesc*> children;  // child members in valid order, once each
   std::vector<const OEFieldDesc*> members;   // every member of the class chain, once each
+  // Position + 1 of each tag from firstTag on (0: not valid here), so that
+  // finding a tag's presence bit does not search the valid array; empty when
+  // the valid tags lie too far apart for a table.
+  OETagID firstTag = OE_TAG_NONE;
+  std::vector<uint8_t> positionOf;
 
  private:
   const OEFieldDesc* FindField(OETagID tag) const;
@@ -289,6 +294,7 @@ class OEAggregate : public OEDataObj {
   using OEDataObj::HandleTagElement;
   OEParseStatus HandleTagElement(const OETagDictionaryEntry* const entry, const OEString& value) override;
   unsigned short GetArrayOfValidTags(OEArrayOfTags& tags) const override;
+  int32_t ValidTagPosition(OETagID tag) const override;
   unsigned short GetArrayOfRequiredTags(OEArrayOfTags& tags) const override;
   OEBuildStatus Build(OEBuilder* builder) const override;
   unsigned short AllRequiredPresent() override;

@@ -75,8 +75,9 @@ class OEDataObj {
  protected:
   OEParser* GetParser() const { return m_parser; }
   void SetParser(OEParser* const parser) { m_parser = parser; }
-  // Position of tag in the valid array, or -1.
-  int32_t ValidTagPosition(OETagID tag) const;
+  // Position of tag in the valid array, or -1. Aggregates answer from a
+  // table made once per class.
+  virtual int32_t ValidTagPosition(OETagID tag) const;
   void SetPresenceBit(int32_t position) { m_present[position >> 5] |= 1u << (position & 31); }
   void ClearPresenceBit(int32_t position) { m_present[position >> 5] &= ~(1u << (position & 31)); }
   bool PresenceBit(int32_t position) const { return (m_present[position >> 5] >> (position & 31)) & 1u; }
