@@ -17,14 +17,14 @@ check() {  # check DESCRIPTION EXPECTED ACTUAL
   if [ "$2" = "$3" ]; then echo "ok   $1"; else echo "FAIL $1: expected '$2', got '$3'"; failures=$((failures + 1)); fi
 }
 
-for cmd in profile accounts "request profile" "request accounts"; do
+for cmd in profile accounts "request profile" "request accounts" "request transfer" "request payment"; do
   $ofxkit $cmd --help | grep -q usage; check "help of $cmd" 0 $?
 done
 echo pw | $ofxkit request accounts --org X --user a --password-stdin --since 2026-01-01 > /dev/null 2>&1
 check "a bad --since is refused" 64 $?
 
 echo "s3cret" | $ofxkit serve --https --cert-out "$work/ca.der" --ready-file "$work/url" --user alice \
-  --password-stdin --transactions 5 --max-requests 8 --max-seconds 60 > /dev/null 2> "$work/server.log" &
+  --password-stdin --transactions 5 --max-requests 10 --max-seconds 60 > /dev/null 2> "$work/server.log" &
 server=$!
 for _ in $(seq 300); do [ -s "$work/url" ] && break; sleep 0.1; done
 url=$(cat "$work/url")
@@ -53,6 +53,23 @@ while IFS=, read -r kind bankid acctid type _; do
   post "$acctid" && [ "$($ofxkit statement "$work/$acctid-rs.ofx" | wc -l)" -eq 6 ] && statements=$((statements + 1))
 done < <(tail -n +2 "$work/accounts.csv")
 check "a statement of five transactions for each account" 4 "$statements"
+# Moving money against the same server: a transfer and a bill payment come
+# back with status 0, a processing status and a server transaction id.
+echo "s3cret" | $ofxkit request transfer "${signon[@]}" --bank-id 121000248 --account 1001 --to-account 1002 \
+  --amount 250.00 --due 20261201 -o "$work/xfer-rq.ofx" 2> /dev/null
+post xfer; check "transfer exchanged" 0 $?
+check "transfer answered: status, processing status, server id" "1 1 1" \
+  "$(grep -c '^<CODE>0' "$work/xfer-rs.ofx" | awk '{print ($1>=2)}') $(grep -c '^<XFERPRCCODE>WILLPROCESSON' "$work/xfer-rs.ofx") $(grep -c '^<SRVRTID>.' "$work/xfer-rs.ofx")"
+echo "s3cret" | $ofxkit request payment "${signon[@]}" --bank-id 121000248 --account 1001 --amount 80.15 \
+  --payee-name "City Power & Light" --payee-addr1 "1 Grid Rd" --payee-city Springfield --payee-state IL \
+  --payee-postal 62701 --payee-phone 555-0142 --pay-account 55-1234 -o "$work/pmt-rq.ofx" 2> /dev/null
+post pmt; check "payment exchanged" 0 $?
+check "payment answered: processing status, server id, payee kept" "1 1 1" \
+  "$(grep -c '^<PMTPRCCODE>WILLPROCESSON' "$work/pmt-rs.ofx") $(grep -c '^<SRVRTID>.' "$work/pmt-rs.ofx") $(grep -c '^<NAME>City Power &amp; Light' "$work/pmt-rs.ofx")"
+echo "s3cret" | $ofxkit request payment "${signon[@]}" --bank-id 121000248 --account 1001 --amount 1 \
+  --payee-id 77 --payee-name X --pay-account 1 > /dev/null 2>&1
+check "a payee both by id and by name is refused" 64 $?
+
 echo "wrong" | $ofxkit request accounts --org Demo --user alice --password-stdin -o "$work/denied-rq.ofx" 2> /dev/null
 post denied
 check "a wrong password gets 15500 and no accounts" "1 0" \

@@ -3,6 +3,7 @@
 
 #include <ofxkit/ofxkit.h>
 
+#include <map>
 #include <memory>
 #include <string>
 #include <vector>
@@ -97,7 +98,15 @@ struct StatementRequestOptions {
   // What is asked besides the sign-on: "statement", "profile" or "accounts"
   // (since: the date of the last account list the client holds).
   std::string kind = "statement", since;
+  // Transfers and payments: the options of kMoveOptionNames that were given.
+  std::map<std::string, std::string> values;
 };
+
+// The options of `request transfer` and `request payment` beyond the sign-on
+// and the account they move money from.
+constexpr const char* kMoveOptionNames[] = {"to-account", "to-bank-id", "to-type", "amount", "due", "memo",
+                                            "pay-account", "payee-id", "payee-name", "payee-addr1",
+                                            "payee-city", "payee-state", "payee-postal", "payee-phone"};
 // Writes a sign-on + statement request file into out; false (with a message
 // on standard error) when an option is not valid.
 bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserPassword& password, OEBuffer& out);
@@ -111,6 +120,9 @@ void AppendWrapped(OERequest& request, OETagID setType, OETagID wrapperType, OET
 OEMessageSetRs* ResponseSet(OEResponse& out, OETagID type);
 // A response wrapper (status 0) around inner, answering wrapper.
 OETransRs* AnswerWrapper(const OETransRq& wrapper, OETagID type, OETagID innerTag, OETransBase* inner);
+// Adds the transfer or payment request that options name; false after a
+// message when an option is missing or not valid.
+bool AppendMoveRequest(const StatementRequestOptions& options, OERequest& request);
 // Adds the profile or account-information request that options name.
 bool AppendFirstContactRequest(const StatementRequestOptions& options, OERequest& request);
 // Writes a request file strictly into out; false after a message.
@@ -167,6 +179,10 @@ bool AskPassword(const char* command, RespondOptions& options);
 // Answers an investment statement or securities-list request set into out
 // (with the security list); false for a set of another type.
 bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, AnswerBudget& budget, OEResponse& out);
+// Answers a bank set's transfers or a bill-payment set's payments into out,
+// each with a processing status and a server transaction id; false for a set
+// whose other requests are still to answer (bank sets), or of another type.
+bool AnswerMoveSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);
 // Answers a profile or signup request set into out; false for a set of
 // another type.
 bool AnswerFirstContactSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);

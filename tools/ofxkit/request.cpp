@@ -31,7 +31,20 @@ const char kRequestHelp[] =
     "                               [--password-stdin] [-o FILE]\n"
     "First contact with an institution: a sign-on and a profile request (what it\n"
     "supports), or an account-information request (which accounts the user holds;\n"
-    "--since asks only for changes after that date).\n";
+    "--since asks only for changes after that date).\n"
+    "\n"
+    "usage: ofxkit request transfer --org ORG --fid FID --user USER --bank-id ROUTING --account ACCT\n"
+    "                               [--type CHECKING] --to-account ACCT [--to-type SAVINGS]\n"
+    "                               --amount N.NN [--due YYYYMMDD] [--password-stdin] [-o FILE]\n"
+    "       ofxkit request payment --org ORG --fid FID --user USER --bank-id ROUTING --account ACCT\n"
+    "                              [--type CHECKING] --amount N.NN [--due YYYYMMDD] [--memo TEXT]\n"
+    "                              --pay-account PAYEE'S-NUMBER-FOR-YOU\n"
+    "                              (--payee-id ID | --payee-name NAME --payee-addr1 LINE --payee-city CITY\n"
+    "                               --payee-state ST --payee-postal CODE --payee-phone PHONE)\n"
+    "                              [--password-stdin] [-o FILE]\n"
+    "Moving money: an intrabank transfer from one account to another of the same\n"
+    "bank, or a bill payment to a payee named by the institution's id or by name and\n"
+    "address. Without --due the money moves today.\n";
 
 bool Fail(const std::string& message) {
   std::fprintf(stderr, "ofxkit request: %s\n", message.c_str());
@@ -71,6 +84,7 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
   signOn->SetAppId(o.appId.c_str());
   if (!signOn->SetAppVer(OEString(o.appVersion.c_str()))) return Fail("--app-version must be a number like 2700");
 
+  if (o.kind == "transfer" || o.kind == "payment") return AppendMoveRequest(o, *request) && WriteRequest(file, out);
   if (o.kind != "statement") return AppendFirstContactRequest(o, *request) && WriteRequest(file, out);
   if (o.type == "INVESTMENT") return AppendInvestmentRequest(o, *request) && WriteRequest(file, out);
   bool card = o.type == "CARD";
@@ -139,7 +153,8 @@ bool WriteRequest(const OEFileRq& file, OEBuffer& out) {
 int CmdRequest(int argc, char** argv) {
   Args args(argc, argv, 2);
   const bool known = argc >= 3 && (!std::strcmp(argv[2], "statement") || !std::strcmp(argv[2], "profile") ||
-                                   !std::strcmp(argv[2], "accounts"));
+                                   !std::strcmp(argv[2], "accounts") || !std::strcmp(argv[2], "transfer") ||
+                                   !std::strcmp(argv[2], "payment"));
   if (args.Flag("help") || !known) {
     bool asked = argc >= 3 && (!std::strcmp(argv[2], "--help") || known);
     std::fputs(kRequestHelp, asked ? stdout : stderr);
@@ -168,6 +183,8 @@ int CmdRequest(int argc, char** argv) {
   o.start = options.Option("start");
   o.since = options.Option("since");
   o.end = options.Option("end");
+  for (const char* name : kMoveOptionNames)
+    if (options.HasOption(name)) o.values[name] = options.Option(name);
   o.appId = options.Option("app-id");
   if (o.appId.empty()) o.appId = "QWIN";
   o.appVersion = options.Option("app-version");

@@ -177,12 +177,11 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         continue;
       }
       if (signedOn && (AnswerInvestmentSet(*set, options.transactions, budget, *out) ||
-                       AnswerFirstContactSet(*set, budget, *out)))
+                       AnswerFirstContactSet(*set, budget, *out) || AnswerMoveSet(*set, budget, *out)))
         continue;
       bool card = set->GetType() == OE_TAG_CREDITCARDMSGSRQV1;
       if (!signedOn || (set->GetType() != OE_TAG_BANKMSGSRQV1 && !card)) continue;
-      OEMessageSetRs* rsSet = new OEMessageSetRs();
-      rsSet->SetType(card ? OE_TAG_CREDITCARDMSGSRSV1 : OE_TAG_BANKMSGSRSV1);
+      OEMessageSetRs* rsSet = ResponseSet(*out, card ? OE_TAG_CREDITCARDMSGSRSV1 : OE_TAG_BANKMSGSRSV1);
       for (unsigned short t = 0; t < set->GetNumTrans(); ++t) {
         const OETransRq* wrapper = set->GetTrans(t);
         const OEGenericStatementRq* stmt =
@@ -200,7 +199,6 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         rsWrapper->SetTag(card ? OE_TAG_CCSTMTRS : OE_TAG_STMTRS);
         rsSet->AppendTrans(rsWrapper);
       }
-      out->AppendMessageSet(rsSet);
     }
   }
   return signedOn;
