@@ -103,8 +103,10 @@ class OEString {
   unsigned short m_specLength;
   unsigned short m_bufferSize;  // 0: null string; up to kInlineBlock: inline
   unsigned short m_length;
-  // The inline block, or the heap block's address once it is larger.
-  char m_store[kInlineBlock];
+  // The inline block, or the heap block's address once it is larger. Aligned
+  // for a pointer, so that leak checkers (which look for pointers only at
+  // aligned places) see the heap block as held.
+  alignas(char*) char m_store[kInlineBlock];
 };
 
 OEString operator+(const OEString& a, const OEString& b);
