@@ -1,6 +1,7 @@
 // Brokerage data of the ofxkit tool: investment transactions (as part of
 // `statement`), positions and balances (`positions`).
 #include <algorithm>
+#include <cstdint>
 #include <cstdio>
 #include <map>
 #include <string>
@@ -25,23 +26,18 @@ const char kPositionsHelp[] =
 
 // The present element `tag` of an aggregate as OFX text; empty when absent.
 std::string ElementText(const OEDataObj* obj, OETagID tag) {
-  const auto* agg = dynamic_cast<const OEAggregate*>(obj);
-  if (!agg || !agg->ValidateTag(tag)) return "";
-  const OEAggregateInfo& info = agg->GetInfo();
+  const auto* agg = static_cast<const OEAggregate*>(obj);  // every object these commands read is one
+  const OEFieldDesc* d = agg ? agg->FieldAt(tag) : nullptr;
   OEString text;
-  for (size_t i = 0; i < info.writeList.size(); ++i)
-    if (info.writeTags[i] == tag && info.writeList[i]->text && info.writeList[i]->text(agg, 0, text))
-      return text.c_str();
-  return "";
+  if (!d || !d->text || !agg->ValidateTag(tag) || !d->text(agg, 0, text)) return "";
+  return text.c_str();
 }
 
-// A child of the given type, or null.
+// The child that stands under the tag (its first, for a list), or null.
 const OEDataObj* ChildOfType(const OEDataObj* obj, OETagID type) {
-  for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i) {
-    const OEDataObj* child = obj->GetChild(i);
-    if (child && child->GetType() == type) return child;
-  }
-  return nullptr;
+  const auto* agg = static_cast<const OEAggregate*>(obj);
+  const OEFieldDesc* d = agg->FieldAt(type);
+  return d && d->get ? d->get(agg, 0) : nullptr;
 }
 
 // The body of a transaction kind that holds its common fields: its INVBUY
@@ -94,7 +90,7 @@ class Securities {
   void Add(const OESecList& list) {
     for (unsigned short i = 0, n = list.GetNumberOfChildren(); i < n; ++i) {
       const OEDataObj* kind = list.GetChild(i);
-      const auto* info = kind ? dynamic_cast<const OESecInfo*>(ChildOfType(kind, OE_TAG_SECINFO)) : nullptr;
+      const auto* info = kind ? static_cast<const OESecInfo*>(ChildOfType(kind, OE_TAG_SECINFO)) : nullptr;
       if (!info || !info->GetSecID()) continue;
       m_byId[Key(*info->GetSecID())] = {info->GetTicker().c_str(), info->GetSecName().c_str()};
     }
@@ -109,9 +105,26 @@ std::string InvAccountName(const OEInvStmtRs& rs) {
 }
 
 struct Row {
-  const OEInvTran* tran;
+  bool dated;
+  int64_t when;      // milliseconds since 1970 (UTC), for ordering
+  std::string date;  // as printed
   std::string text;  // the CSV line after the date
 };
+
+// Days since 1970-01-01 of a civil date (proleptic Gregorian calendar).
+int64_t DaysFromCivil(int64_t y, unsigned m, unsigned d) {
+  y -= m <= 2;
+  const int64_t era = (y >= 0 ? y : y - 399) / 400;
+  const unsigned yoe = static_cast<unsigned>(y - era * 400);
+  const unsigned doy = (153 * (m > 2 ? m - 3 : m + 9) + 2) / 5 + d - 1;
+  const unsigned doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
+  return era * 146097 + static_cast<int64_t>(doe) - 719468;
+}
+
+int64_t SortKey(const OEDateTime& t) {
+  int64_t hours = DaysFromCivil(t.GetYear(), t.GetMonth(), t.GetDay()) * 24 + t.GetHour() - t.GetTimeZoneOffset();
+  return ((hours * 60 + t.GetMinute()) * 60 + t.GetSecond()) * 1000 + t.GetMilliseconds();
+}
 
 }  // namespace
 
@@ -135,14 +148,15 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       OEDataObj* kind = list->GetChild(i);
       if (!kind) continue;
       const OEDataObj* body = TransactionBody(kind);
-      const OEInvTran* tran = dynamic_cast<const OEInvTran*>(ChildOfType(body, OE_TAG_INVTRAN));
+      const OEInvTran* tran = static_cast<const OEInvTran*>(ChildOfType(body, OE_TAG_INVTRAN));
       const OEDataObj* amounts = body;
-      if (auto* bank = dynamic_cast<OEInvBankTran*>(kind)) {
+      if (kind->GetType() == OE_TAG_INVBANKTRAN) {
+        auto* bank = static_cast<OEInvBankTran*>(kind);
         tran = bank->GetInvTran();
         amounts = bank->GetStatementTx();
       }
       std::string security, name;
-      securities.Describe(dynamic_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), security, name);
+      securities.Describe(static_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), security, name);
       std::string total = amounts ? ElementText(amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT) : "";
       std::string line = CsvText(TagName(kind->GetType()), raw) + "," + CsvText(security.c_str(), raw) + "," +
                          CsvText(name.c_str(), raw) +
@@ -153,21 +167,17 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
                          KindText(kind, body, OE_TAG_SUBACCTTO) + "," +
                          CsvText(tran ? tran->GetFITId().c_str() : "", raw) + "," +
                          CsvText(tran ? tran->GetMemo().c_str() : "", raw);
-      rows.push_back({tran, std::move(line)});
+      bool dated = tran && tran->ValidateTag(OE_TAG_DTTRADE);
+      rows.push_back({dated, dated ? SortKey(tran->GetDtTrade()) : 0, dated ? IsoDate(tran->GetDtTrade()) : "",
+                      std::move(line)});
     }
     // Trade-date order; transactions without a date last, each kind's
     // order kept among equal dates.
     std::stable_sort(rows.begin(), rows.end(), [](const Row& a, const Row& b) {
-      bool da = a.tran && a.tran->ValidateTag(OE_TAG_DTTRADE);
-      bool db = b.tran && b.tran->ValidateTag(OE_TAG_DTTRADE);
-      if (da != db) return da;
-      return da && a.tran->GetDtTrade() < b.tran->GetDtTrade();
+      if (a.dated != b.dated) return a.dated;
+      return a.when < b.when;
     });
-    for (const Row& row : rows) {
-      bool dated = row.tran && row.tran->ValidateTag(OE_TAG_DTTRADE);
-      std::printf("%s%s,%s\n", account.c_str(), dated ? IsoDate(row.tran->GetDtTrade()).c_str() : "",
-                  row.text.c_str());
-    }
+    for (const Row& row : rows) std::printf("%s%s,%s\n", account.c_str(), row.date.c_str(), row.text.c_str());
   }
   return true;
 }
@@ -210,7 +220,7 @@ int CmdPositions(int argc, char** argv) {
     const OEInvPosList* list = rs->GetInvPosList();
     for (unsigned short i = 0, n = list ? list->GetNumberOfChildren() : 0; i < n; ++i) {
       const OEDataObj* kind = list->GetChild(i);
-      const auto* pos = kind ? dynamic_cast<const OEInvPos*>(ChildOfType(kind, OE_TAG_INVPOS)) : nullptr;
+      const auto* pos = kind ? static_cast<const OEInvPos*>(ChildOfType(kind, OE_TAG_INVPOS)) : nullptr;
       if (!pos) continue;
       std::string security, name;
       securities.Describe(pos->GetSecID(), security, name);
