@@ -105,7 +105,7 @@ class Auditor {
   void CheckCData(const OEParseEngine::OETagItemInfo& item);
   void Note(AuditKind kind, OETagID tag, OETagID parent, int32_t position, int32_t until,
             const OEParseEngine::OETagItemInfo* item = nullptr);
-  OETagID Lookup(const char* name, unsigned short length) const;
+  OETagID Lookup(const char* name, unsigned short length);
   uint32_t& Slot(std::vector<uint32_t>& counts, OETagID id) {
     if (id >= counts.size()) counts.resize(id + 1u, 0);
     return counts[id];
@@ -119,6 +119,7 @@ class Auditor {
   const char* m_data = nullptr;
   int32_t m_length = 0;
   OETagDictionary* m_dictionary = OETagDictionary::TheOETagDictionary();
+  OETagNameCache m_names;
   std::vector<bool> m_audited;
   std::vector<uint32_t> m_inTree, m_inText;
   std::vector<int32_t> m_firstUnread;  // per tag: the start tag after as many as the tree holds
@@ -130,9 +131,14 @@ class Auditor {
   AuditReport m_report;
 };
 
-OETagID Auditor::Lookup(const char* name, unsigned short length) const {
+OETagID Auditor::Lookup(const char* name, unsigned short length) {
+  if (const OETagDictionaryEntry* entry = m_names.Find(name, length)) return entry->id;
   OETagID id = OE_TAG_NONE;
-  if (m_dictionary && length) m_dictionary->GetTagID(name, length, &id, OE_CASE_IGNORE);
+  if (!m_dictionary || !length) return id;
+  if (const OETagDictionaryEntry* entry = m_dictionary->GetTagID(name, length, &id, OE_CASE_EXACT))
+    m_names.Remember(entry, name, length);
+  else
+    m_dictionary->GetTagID(name, length, &id, OE_CASE_IGNORE);
   return id;
 }
 

@@ -41,12 +41,6 @@ bool ContainsIgnoringCase(const char* hay, size_t n, const char* needle) {
 }
 
 // Names are short: a plain loop beats a library call.
-inline bool SameText(const char* a, const char* b, size_t n) {
-  for (size_t i = 0; i < n; ++i) {
-    if (a[i] != b[i]) return false;
-  }
-  return true;
-}
 
 inline bool HasLowerCase(const char* text, size_t n) {
   for (size_t i = 0; i < n; ++i) {
@@ -461,7 +455,7 @@ inline void OEParseEngine::Refresh() {
 }
 
 void OEParseEngine::ForgetNames() {
-  for (NameCacheSlot& slot : m_nameCache) slot = {nullptr, 0};
+  m_nameCache.Clear();
 }
 
 void OEParseEngine::ForgetSearches() {
@@ -717,27 +711,16 @@ unsigned short OEParseEngine::ExpandSgmlMacros(OEString& in, OEString& out) cons
 // ---------------------------------------------------------------------------
 // Tags
 
-namespace {
-inline unsigned NameHash(const char* name, unsigned short length) {
-  const unsigned char* u = reinterpret_cast<const unsigned char*>(name);
-  return (length * 61u + u[0] * 7u + u[length - 1] * 3u + u[length / 2]) & 0x7Fu;
-}
-}  // namespace
-
-// Names repeat heavily in a statement, so exact-case answers of the
-// dictionary are kept in a small cache, checked against the entry's own name.
 inline const OETagDictionaryEntry* OEParseEngine::Lookup(int32_t start, unsigned short length, OETagID* id) {
-  if (length > 0) {
-    const char* name = m_text + start;
-    const NameCacheSlot& slot = m_nameCache[NameHash(name, length)];
-    if (slot.length == length && SameText(slot.entry->name, name, length)) {
-      if (id) *id = slot.entry->id;
-      return slot.entry;
-    }
-    return LookupSlow(name, length, id);
+  if (const OETagDictionaryEntry* entry = m_nameCache.Find(m_text + start, length)) {
+    if (id) *id = entry->id;
+    return entry;
   }
-  if (id) *id = OE_TAG_NONE;
-  return nullptr;
+  if (length == 0) {
+    if (id) *id = OE_TAG_NONE;
+    return nullptr;
+  }
+  return LookupSlow(m_text + start, length, id);
 }
 
 const OETagDictionaryEntry* OEParseEngine::LookupSlow(const char* name, unsigned short length, OETagID* id) {
@@ -745,7 +728,7 @@ const OETagDictionaryEntry* OEParseEngine::LookupSlow(const char* name, unsigned
   const OETagDictionaryEntry* entry = m_dictionary ? m_dictionary->GetTagID(name, length, &found, OE_CASE_EXACT)
                                                    : nullptr;
   if (entry) {
-    m_nameCache[NameHash(name, length)] = {entry, length};
+    m_nameCache.Remember(entry, name, length);
   } else if (HasLowerCase(name, length)) {
     if (m_dictionary) entry = m_dictionary->GetTagID(name, length, &found, OE_CASE_IGNORE);
     Log(OEPW_LOWERCASE, nullptr, 0, name, length, found);

@@ -145,11 +145,14 @@ size_t Utf8Converter::Convert(const char* text, size_t n, std::string& out) {
 
 std::string Utf8Converter::operator()(const char* text, const char* field) {
   std::string out;
-  if (!text) return out;
-  size_t bad = Convert(text, std::strlen(text), out);
+  if (text) Append(text, std::strlen(text), out, field);
+  return out;
+}
+
+void Utf8Converter::Append(const char* text, size_t n, std::string& out, const char* field) {
+  size_t bad = Convert(text, n, out);
   if (bad && m_unconverted == 0 && field) m_firstField = field;
   m_unconverted += bad;
-  return out;
 }
 
 std::string Utf8Converter::Report() const {

@@ -40,6 +40,8 @@ class Utf8Converter {
   // The UTF-8 form of a nul-terminated text; bytes that did not convert are
   // added to Unconverted() and the first field that held one is remembered.
   std::string operator()(const char* text, const char* field = nullptr);
+  // The same, appended to out.
+  void Append(const char* text, size_t n, std::string& out, const char* field = nullptr);
 
   // Bytes that did not convert, over every call of operator().
   size_t Unconverted() const { return m_unconverted; }

@@ -48,6 +48,15 @@ struct ParsedFile {
   OEDataObj* objectWithError = nullptr;
   // What the text holds that the tree does not (read once more after the parse).
   ofxkit::AuditReport audit;
+  // A command that reads one file and ends keeps the tree until the process
+  // ends instead of taking it apart object by object (a few milliseconds on
+  // a large statement); the system takes the memory back at once.
+  bool keepUntilExit = false;
+
+  ParsedFile() = default;
+  ParsedFile(const ParsedFile&) = delete;
+  ParsedFile& operator=(const ParsedFile&) = delete;
+  ~ParsedFile();
 };
 
 // Reads a whole file; false with a message when it cannot.
@@ -77,11 +86,16 @@ int ReportLosses(const char* command, const ParsedFile& parsed, int rc);
 // convert are counted (and named by field, when given) for ReportLosses to
 // report. Every text of the file that the tool prints goes through here.
 std::string OutputText(const char* text, const char* field = nullptr);
+// The same for n bytes at text, appended to out.
+void AppendOutputText(std::string& out, const char* text, size_t n, const char* field = nullptr);
 // A text field of CSV output: quoted when it holds a comma, quote or line
 // break, converted as OutputText does. Unless raw, a text that a spreadsheet would run as a formula (one
 // that begins with '=', '+', '-', '@', a tab or a carriage return) is
 // prefixed with a single quote. Amounts and dates are not passed through here.
 std::string CsvText(const char* text, bool raw, const char* field = nullptr);
+// The same, appended to out (no temporary per field: rows of large files are
+// made this way).
+void AppendCsv(std::string& out, const char* text, bool raw, const char* field = nullptr);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard
@@ -201,14 +215,18 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
 // status of the parse.
 bool ParseCommandFile(const char* command, const char* help, Args& args, ParsedFile& parsed, bool* raw, int* rc);
 
-// The objects of class T anywhere under obj, in document order (not looking
-// inside one that is found).
+// The objects of class T under obj, in document order: the envelope down to
+// the requests and responses that wrappers hold. It does not look inside one
+// that is found, nor inside another wrapper's request or response (a
+// statement holds no statements: walking its transactions would cost more
+// than the rest of a command).
 template <class T>
 void Collect(const OEDataObj* obj, std::vector<const T*>& out) {
   if (const T* found = dynamic_cast<const T*>(obj)) {
     out.push_back(found);
     return;
   }
+  if (dynamic_cast<const OETransBase*>(obj)) return;
   for (unsigned short i = 0, n = obj->GetNumberOfChildren(); i < n; ++i)
     if (const OEDataObj* child = obj->GetChild(i)) Collect(child, out);
 }

@@ -255,8 +255,16 @@ int ParseOFXBuffer(OEBuffer& buffer, const std::string& name, ParsedFile& parsed
 }
 
 std::string OutputText(const char* text, const char* field) {
-  if (!text) return std::string();
-  return g_fileText ? (*g_fileText)(text, field) : std::string(text);
+  std::string out;
+  if (text) AppendOutputText(out, text, std::strlen(text), field);
+  return out;
+}
+
+void AppendOutputText(std::string& out, const char* text, size_t n, const char* field) {
+  if (g_fileText)
+    g_fileText->Append(text, n, out, field);
+  else
+    out.append(text, n);
 }
 
 int ReportLosses(const char* command, const ParsedFile& parsed, int rc) {
@@ -269,13 +277,27 @@ int ReportLosses(const char* command, const ParsedFile& parsed, int rc) {
   return parsed.audit.HasLoss() && rc == kClean ? kWarnings : rc;
 }
 
+void AppendCsv(std::string& out, const char* text, bool raw, const char* field) {
+  if (!text) return;
+  const size_t start = out.size();
+  AppendOutputText(out, text, std::strlen(text), field);
+  if (out.size() == start) return;
+  if (!raw && std::strchr("=+-@\t\r", out[start]) && out[start] != '\0') out.insert(start, 1, '\'');
+  if (out.find_first_of(",\"\r\n", start) == std::string::npos) return;
+  const std::string field_text = out.substr(start);
+  out.resize(start);
+  out += '"';
+  for (char c : field_text) {
+    if (c == '"') out += '"';
+    out += c;
+  }
+  out += '"';
+}
+
 std::string CsvText(const char* text, bool raw, const char* field) {
-  std::string s = OutputText(text, field);
-  if (!raw && !s.empty() && std::strchr("=+-@\t\r", s[0])) s.insert(0, 1, '\'');
-  if (s.find_first_of(",\"\r\n") == std::string::npos) return s;
-  std::string quoted = "\"";
-  for (char c : s) quoted += c == '"' ? std::string("\"\"") : std::string(1, c);
-  return quoted + "\"";
+  std::string out;
+  AppendCsv(out, text, raw, field);
+  return out;
 }
 
 const char* TagName(OETagID tag) {
@@ -315,8 +337,16 @@ bool PromptPassword(const char* prompt, OEUserPassword& out) {
 
 // Parses FILE for a command: false with *rc the exit status when the command
 // ends here, else true with *rc the parse's exit status.
+ParsedFile::~ParsedFile() {
+  if (!keepUntilExit || !file) return;
+  // Held from a global, so that leak checkers see the tree as still in use.
+  static auto* kept = new std::vector<std::unique_ptr<OEFileOFX>>;
+  kept->push_back(std::move(file));
+}
+
 bool ParseCommandFile(const char* command, const char* help, Args& args, ParsedFile& parsed, bool* raw, int* rc) {
   *rc = kClean;
+  parsed.keepUntilExit = true;
   if (args.Flag("help")) {
     std::fputs(help, stdout);
     return false;

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <cstdio>
-#include <map>
+#include <unordered_map>
 #include <string>
 #include <vector>
 
@@ -24,13 +24,23 @@ const char kPositionsHelp[] =
     "could not be read are reported on standard error, and the exit status is\n"
     "then never 0. Exit status as for 'ofxkit dump'.\n";
 
-// The present element `tag` of an aggregate as OFX text; empty when absent.
-std::string ElementText(const OEDataObj* obj, OETagID tag) {
+// Appends the present element `tag` of an aggregate as OFX text; nothing
+// when absent. Answers whether anything was appended.
+bool AppendElement(std::string& out, const OEDataObj* obj, OETagID tag) {
   const auto* agg = static_cast<const OEAggregate*>(obj);  // every object these commands read is one
   const OEFieldDesc* d = agg ? agg->FieldAt(tag) : nullptr;
-  OEString text;
-  if (!d || !d->text || !agg->ValidateTag(tag) || !d->text(agg, 0, text)) return "";
-  return text.c_str();
+  if (!d || !d->text || !agg->ValidateTag(tag)) return false;
+  thread_local OEString text;
+  if (!d->text(agg, 0, text)) return false;
+  out.append(text.c_str(), text.GetStrLength());
+  return text.GetStrLength() != 0;
+}
+
+// The present element `tag` of an aggregate as OFX text; empty when absent.
+std::string ElementText(const OEDataObj* obj, OETagID tag) {
+  std::string text;
+  AppendElement(text, obj, tag);
+  return text;
 }
 
 // The child that stands under the tag (its first, for a list), or null.
@@ -48,10 +58,10 @@ const OEDataObj* TransactionBody(const OEDataObj* kind) {
   return kind;
 }
 
-// An element of a kind or of its body.
-std::string KindText(const OEDataObj* kind, const OEDataObj* body, OETagID tag) {
-  std::string text = ElementText(body, tag);
-  return text.empty() && body != kind ? ElementText(kind, tag) : text;
+// Appends an element of a kind's body, or of the kind itself when the body
+// has none.
+void AppendKindElement(std::string& out, const OEDataObj* kind, const OEDataObj* body, OETagID tag) {
+  if (!AppendElement(out, body, tag) && body != kind) AppendElement(out, kind, tag);
 }
 
 std::string IsoDate(const OEDateTime& d) {
@@ -70,6 +80,23 @@ class Securities {
       if (const OESecList* list = set->GetSecList()) Add(*list);
   }
 
+  // Appends the security's CSV fields: "ticker" (the id as TYPE:ID when no
+  // ticker is known) and its name.
+  void Append(std::string& out, const OESecID* id, bool raw) {
+    if (!id) {
+      out += ',';
+      return;
+    }
+    m_key.assign(id->GetUniqueIDType().c_str());
+    m_key += ':';
+    m_key += id->GetUniqueID().c_str();
+    auto found = m_byId.find(m_key);
+    const bool ticker = found != m_byId.end() && !found->second.first.empty();
+    AppendCsv(out, ticker ? found->second.first.c_str() : m_key.c_str(), raw);
+    out += ',';
+    if (found != m_byId.end()) AppendCsv(out, found->second.second.c_str(), raw);
+  }
+
   // "ticker" (or the id when no ticker is known) and the security's name.
   void Describe(const OESecID* id, std::string& security, std::string& name) const {
     security.clear();
@@ -80,7 +107,7 @@ class Securities {
       security = found->second.first;
       name = found->second.second;
     }
-    if (security.empty()) security = std::string(id->GetUniqueIDType().c_str()) + ":" + id->GetUniqueID().c_str();
+    if (security.empty()) security = Key(*id);
   }
 
  private:
@@ -95,7 +122,8 @@ class Securities {
       m_byId[Key(*info->GetSecID())] = {info->GetTicker().c_str(), info->GetSecName().c_str()};
     }
   }
-  std::map<std::string, std::pair<std::string, std::string>> m_byId;
+  std::unordered_map<std::string, std::pair<std::string, std::string>> m_byId;
+  std::string m_key;
 };
 
 std::string InvAccountName(const OEInvStmtRs& rs) {
@@ -104,11 +132,12 @@ std::string InvAccountName(const OEInvStmtRs& rs) {
   return std::string(account->GetBrokerID().c_str()) + ":" + account->GetAccountID().c_str();
 }
 
+// A transaction's line, kept in one text shared by all lines.
 struct Row {
+  int64_t when;    // milliseconds since 1970 (UTC), for ordering
+  uint32_t begin;  // the line in the shared text
+  uint32_t length;
   bool dated;
-  int64_t when;      // milliseconds since 1970 (UTC), for ordering
-  std::string date;  // as printed
-  std::string text;  // the CSV line after the date
 };
 
 // Days since 1970-01-01 of a civil date (proleptic Gregorian calendar).
@@ -138,13 +167,19 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       "%sdate,kind,security,name,units,unitprice,commission,total,subacctsec,subacctfund,subacctfrom,subacctto,"
       "fitid,memo\n",
       withAccount ? "account," : "");
+  std::string text;
+  std::vector<Row> rows;
   for (const OEInvStmtRs* rs : statements) {
     OEInvTranList* list = rs->GetInvTranList();
     if (!list) continue;
     list->BuildGenericInvTranList();  // fills the bank transactions' INVTRAN
     std::string account = withAccount ? CsvText(InvAccountName(*rs).c_str(), raw) + "," : "";
-    std::vector<Row> rows;
-    for (unsigned short i = 0, n = list->GetNumberOfChildren(); i < n; ++i) {
+    const unsigned short n = list->GetNumberOfChildren();
+    text.clear();
+    text.reserve(static_cast<size_t>(n) * 160);
+    rows.clear();
+    rows.reserve(n);
+    for (unsigned short i = 0; i < n; ++i) {
       OEDataObj* kind = list->GetChild(i);
       if (!kind) continue;
       const OEDataObj* body = TransactionBody(kind);
@@ -155,21 +190,36 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
         tran = bank->GetInvTran();
         amounts = bank->GetStatementTx();
       }
-      std::string security, name;
-      securities.Describe(static_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), security, name);
-      std::string total = amounts ? ElementText(amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT) : "";
-      std::string line = CsvText(TagName(kind->GetType()), raw) + "," + CsvText(security.c_str(), raw) + "," +
-                         CsvText(name.c_str(), raw) +
-                         "," + KindText(kind, body, OE_TAG_UNITS) + "," + KindText(kind, body, OE_TAG_UNITPRICE) +
-                         "," + KindText(kind, body, OE_TAG_COMMISSION) + "," + total + "," +
-                         KindText(kind, body, OE_TAG_SUBACCTSEC) + "," + KindText(kind, body, OE_TAG_SUBACCTFUND) +
-                         "," + KindText(kind, body, OE_TAG_SUBACCTFROM) + "," +
-                         KindText(kind, body, OE_TAG_SUBACCTTO) + "," +
-                         CsvText(tran ? tran->GetFITId().c_str() : "", raw) + "," +
-                         CsvText(tran ? tran->GetMemo().c_str() : "", raw);
-      bool dated = tran && tran->ValidateTag(OE_TAG_DTTRADE);
-      rows.push_back({dated, dated ? SortKey(tran->GetDtTrade()) : 0, dated ? IsoDate(tran->GetDtTrade()) : "",
-                      std::move(line)});
+      const bool dated = tran && tran->ValidateTag(OE_TAG_DTTRADE);
+      const size_t begin = text.size();
+      text += account;
+      if (dated) {
+        const OEDateTime& d = tran->GetDtTrade();
+        char date[24];
+        const int length = std::snprintf(date, sizeof date, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
+        text.append(date, static_cast<size_t>(length));
+      }
+      text += ',';
+      AppendCsv(text, TagName(kind->GetType()), raw);
+      text += ',';
+      securities.Append(text, static_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), raw);
+      for (OETagID tag : {OE_TAG_UNITS, OE_TAG_UNITPRICE, OE_TAG_COMMISSION}) {
+        text += ',';
+        AppendKindElement(text, kind, body, tag);
+      }
+      text += ',';
+      if (amounts) AppendElement(text, amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT);
+      for (OETagID tag : {OE_TAG_SUBACCTSEC, OE_TAG_SUBACCTFUND, OE_TAG_SUBACCTFROM, OE_TAG_SUBACCTTO}) {
+        text += ',';
+        AppendKindElement(text, kind, body, tag);
+      }
+      text += ',';
+      if (tran) AppendCsv(text, tran->GetFITId().c_str(), raw);
+      text += ',';
+      if (tran) AppendCsv(text, tran->GetMemo().c_str(), raw);
+      text += '\n';
+      rows.push_back({dated ? SortKey(tran->GetDtTrade()) : 0, static_cast<uint32_t>(begin),
+                      static_cast<uint32_t>(text.size() - begin), dated});
     }
     // Trade-date order; transactions without a date last, each kind's
     // order kept among equal dates.
@@ -177,7 +227,7 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       if (a.dated != b.dated) return a.dated;
       return a.when < b.when;
     });
-    for (const Row& row : rows) std::printf("%s%s,%s\n", account.c_str(), row.date.c_str(), row.text.c_str());
+    for (const Row& row : rows) std::fwrite(text.data() + row.begin, 1, row.length, stdout);
   }
   return true;
 }

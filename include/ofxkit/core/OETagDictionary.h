@@ -213,6 +213,39 @@ class OETagDictionary : public TagDictionary {
   static OETagDictionary* ms_theOETagDictionary;
 };
 
+// Recent exact-case answers of a dictionary, by a hash of the name: names
+// repeat heavily in a statement, and a hit costs one comparison with the
+// entry's own name instead of a search.
+class OETagNameCache {
+ public:
+  const OETagDictionaryEntry* Find(const char* name, unsigned short length) const {
+    if (length == 0) return nullptr;
+    const Slot& slot = m_slots[Hash(name, length)];
+    if (slot.length != length) return nullptr;
+    for (unsigned short i = 0; i < length; ++i)
+      if (slot.entry->name[i] != name[i]) return nullptr;
+    return slot.entry;
+  }
+  void Remember(const OETagDictionaryEntry* entry, const char* name, unsigned short length) {
+    if (entry && length) m_slots[Hash(name, length)] = {entry, length};
+  }
+  void Clear() {
+    for (Slot& slot : m_slots) slot = {nullptr, 0};
+  }
+
+ private:
+  struct Slot {
+    const OETagDictionaryEntry* entry;
+    unsigned short length;
+  };
+  static constexpr unsigned kSlots = 128;
+  static unsigned Hash(const char* name, unsigned short length) {
+    const unsigned char* u = reinterpret_cast<const unsigned char*>(name);
+    return (length * 61u + u[0] * 7u + u[length - 1] * 3u + u[length / 2]) & (kSlots - 1);
+  }
+  Slot m_slots[kSlots] = {};
+};
+
 // Number of rows of the built-in table (ids 1 to this number, in order).
 unsigned short NumberOfOEDictionaryEntry();
 

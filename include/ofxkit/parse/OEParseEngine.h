@@ -188,12 +188,6 @@ class OEParseEngine {
     unsigned short victim;  // pair replaced next
   };
   static constexpr int kFindMemos = 7;
-  // Recent exact-case dictionary answers, by a hash of the name.
-  struct NameCacheSlot {
-    const OETagDictionaryEntry* entry;
-    unsigned short length;
-  };
-  static constexpr unsigned kNameCacheSlots = 128;
 
   // Re-reads the buffer's address and size; when they changed, finds the end
   // of the text again and forgets every cached search.
@@ -224,5 +218,5 @@ class OEParseEngine {
   int32_t m_textEnd;
   FindMemo m_findMemo[kFindMemos];
   SkipMemoHolder m_skipMemo;  // end tags after a failed skip
-  NameCacheSlot m_nameCache[kNameCacheSlots];
+  OETagNameCache m_nameCache;
 };
