@@ -58,6 +58,29 @@ OEBuffer::~OEBuffer() {
   }
 }
 
+namespace {
+constexpr size_t kHugePage = size_t{2} << 20;
+}  // namespace
+
+// A block of n bytes. One of megabytes (a whole file read at once) is
+// aligned to, and a whole number of, 2 MB pages, and the kernel is asked to
+// back it with huge pages where it offers them: touching it then costs a
+// fault per 2 MB instead of one per 4 KB, which on some virtual machines is
+// most of the time it takes to read a file. Such a block is an ordinary heap
+// block to realloc and free.
+char* OEBuffer::LargeBlock(uint32_t n) {
+#if defined(__linux__) && defined(MADV_HUGEPAGE)
+  if (n >= kHugePage) {
+    const size_t rounded = (static_cast<size_t>(n) + kHugePage - 1) & ~(kHugePage - 1);
+    void* block = nullptr;
+    if (posix_memalign(&block, kHugePage, rounded) != 0) return nullptr;
+    madvise(block, rounded, MADV_HUGEPAGE);
+    return static_cast<char*>(block);
+  }
+#endif
+  return static_cast<char*>(malloc(n));
+}
+
 uint32_t OEBuffer::GrowBuffer(uint32_t n) {
   if (n == 0 && m_growBy == 0) return 0;
   uint32_t max = GetMaxBufferSize();
@@ -66,7 +89,17 @@ uint32_t OEBuffer::GrowBuffer(uint32_t n) {
   uint64_t wanted = static_cast<uint64_t>(m_allocation) + increment;
   uint32_t newAllocation = wanted > max ? max : static_cast<uint32_t>(wanted);
   if (newAllocation - m_allocation < n) return 0;
-  char* block = static_cast<char*>(realloc(m_data, newAllocation));
+  char* block;
+  if (m_data && (m_allocation >= kHugePage || newAllocation < kHugePage)) {
+    block = static_cast<char*>(realloc(m_data, newAllocation));
+  } else {
+    // Growing past 2 MB (or the first block): a block made for its size.
+    block = LargeBlock(newAllocation);
+    if (block && m_data) {
+      memcpy(block, m_data, m_allocation);
+      free(m_data);
+    }
+  }
   if (!block) {
     g_allocFailed = 1;
     return 0;
@@ -225,14 +258,6 @@ OEBuffer* ReadSized(FILE* f, uint32_t length, int* failure) {
     *failure = ENOMEM;
     return buffer;
   }
-#if defined(__linux__)
-  // Megabytes of text: let the kernel back them with huge pages where it
-  // offers them, rather than fault them in 4 KB at a time.
-  constexpr uintptr_t kHuge = uintptr_t{2} << 20;
-  uintptr_t start = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + kHuge - 1) & ~(kHuge - 1);
-  uintptr_t end = (reinterpret_cast<uintptr_t>(buffer->GetBufferPtr()) + length) & ~(kHuge - 1);
-  if (end > start) madvise(reinterpret_cast<void*>(start), end - start, MADV_HUGEPAGE);
-#endif
   size_t got = length ? fread(buffer->GetBufferPtr(), 1, length, f) : 0;
   // A file that changed size under us: what was read is what there is.
   if (got != length && ferror(f)) *failure = EIO;

@@ -148,7 +148,6 @@ OEDateTimeBase::OEDateTimeBase(unsigned short year, unsigned short month, unsign
 
 OEDateTimeBase::OEDateTimeBase(const OEDateTimeBase& other) : OEDateTimeBase() { operator=(other); }
 
-OEDateTimeBase::~OEDateTimeBase() { free(m_binary); }
 
 unsigned short OEDateTimeBase::operator=(const char*) { return 0; }
 

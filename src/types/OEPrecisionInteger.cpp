@@ -244,9 +244,11 @@ OEPrecisionInteger::OEPrecisionInteger(const OEPrecisionInteger& other)
       m_text(nullptr),
       m_binary(nullptr) {}
 
-OEPrecisionInteger::~OEPrecisionInteger() {
+void OEPrecisionInteger::FreeBlocks() {
   delete[] m_text;
   delete[] m_binary;
+  m_text = nullptr;
+  m_binary = nullptr;
 }
 
 OEPrecisionInteger& OEPrecisionInteger::operator=(const char* text) {

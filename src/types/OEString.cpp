@@ -36,10 +36,6 @@ OEString::OEString(OEString&& other) noexcept : OEString() {
   m_specLength = other.m_specLength;
 }
 
-OEString::~OEString() {
-  if (!IsInline()) free(HeapBlock());
-}
-
 // Takes other's block (its address, or the inline bytes) and leaves other null.
 void OEString::TakeStorage(OEString& other) {
   Release();

@@ -132,11 +132,11 @@ std::string InvAccountName(const OEInvStmtRs& rs) {
   return std::string(account->GetBrokerID().c_str()) + ":" + account->GetAccountID().c_str();
 }
 
-// A transaction's line, kept in one text shared by all lines.
+// A transaction in the order of printing.
 struct Row {
-  int64_t when;    // milliseconds since 1970 (UTC), for ordering
-  uint32_t begin;  // the line in the shared text
-  uint32_t length;
+  int64_t when;  // milliseconds since 1970 (UTC), for ordering
+  OEDataObj* kind;
+  const OEInvTran* tran;
   bool dated;
 };
 
@@ -167,59 +167,26 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       "%sdate,kind,security,name,units,unitprice,commission,total,subacctsec,subacctfund,subacctfrom,subacctto,"
       "fitid,memo\n",
       withAccount ? "account," : "");
-  std::string text;
+  std::string line;
   std::vector<Row> rows;
   for (const OEInvStmtRs* rs : statements) {
     OEInvTranList* list = rs->GetInvTranList();
     if (!list) continue;
     list->BuildGenericInvTranList();  // fills the bank transactions' INVTRAN
     std::string account = withAccount ? CsvText(InvAccountName(*rs).c_str(), raw) + "," : "";
+    // Ordered first, then each line made and written in turn: the lines of a
+    // large statement are never all held at once.
     const unsigned short n = list->GetNumberOfChildren();
-    text.clear();
-    text.reserve(static_cast<size_t>(n) * 160);
     rows.clear();
     rows.reserve(n);
     for (unsigned short i = 0; i < n; ++i) {
       OEDataObj* kind = list->GetChild(i);
       if (!kind) continue;
-      const OEDataObj* body = TransactionBody(kind);
-      const OEInvTran* tran = static_cast<const OEInvTran*>(ChildOfType(body, OE_TAG_INVTRAN));
-      const OEDataObj* amounts = body;
-      if (kind->GetType() == OE_TAG_INVBANKTRAN) {
-        auto* bank = static_cast<OEInvBankTran*>(kind);
-        tran = bank->GetInvTran();
-        amounts = bank->GetStatementTx();
-      }
+      const OEInvTran* tran = kind->GetType() == OE_TAG_INVBANKTRAN
+                                  ? static_cast<OEInvBankTran*>(kind)->GetInvTran()
+                                  : static_cast<const OEInvTran*>(ChildOfType(TransactionBody(kind), OE_TAG_INVTRAN));
       const bool dated = tran && tran->ValidateTag(OE_TAG_DTTRADE);
-      const size_t begin = text.size();
-      text += account;
-      if (dated) {
-        const OEDateTime& d = tran->GetDtTrade();
-        char date[24];
-        const int length = std::snprintf(date, sizeof date, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
-        text.append(date, static_cast<size_t>(length));
-      }
-      text += ',';
-      AppendCsv(text, TagName(kind->GetType()), raw);
-      text += ',';
-      securities.Append(text, static_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), raw);
-      for (OETagID tag : {OE_TAG_UNITS, OE_TAG_UNITPRICE, OE_TAG_COMMISSION}) {
-        text += ',';
-        AppendKindElement(text, kind, body, tag);
-      }
-      text += ',';
-      if (amounts) AppendElement(text, amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT);
-      for (OETagID tag : {OE_TAG_SUBACCTSEC, OE_TAG_SUBACCTFUND, OE_TAG_SUBACCTFROM, OE_TAG_SUBACCTTO}) {
-        text += ',';
-        AppendKindElement(text, kind, body, tag);
-      }
-      text += ',';
-      if (tran) AppendCsv(text, tran->GetFITId().c_str(), raw);
-      text += ',';
-      if (tran) AppendCsv(text, tran->GetMemo().c_str(), raw);
-      text += '\n';
-      rows.push_back({dated ? SortKey(tran->GetDtTrade()) : 0, static_cast<uint32_t>(begin),
-                      static_cast<uint32_t>(text.size() - begin), dated});
+      rows.push_back({dated ? SortKey(tran->GetDtTrade()) : 0, kind, tran, dated});
     }
     // Trade-date order; transactions without a date last, each kind's
     // order kept among equal dates.
@@ -227,7 +194,40 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       if (a.dated != b.dated) return a.dated;
       return a.when < b.when;
     });
-    for (const Row& row : rows) std::fwrite(text.data() + row.begin, 1, row.length, stdout);
+    for (const Row& row : rows) {
+      OEDataObj* kind = row.kind;
+      const OEInvTran* tran = row.tran;
+      const OEDataObj* body = TransactionBody(kind);
+      const OEDataObj* amounts =
+          kind->GetType() == OE_TAG_INVBANKTRAN ? static_cast<OEInvBankTran*>(kind)->GetStatementTx() : body;
+      line.assign(account);
+      if (row.dated) {
+        const OEDateTime& d = tran->GetDtTrade();
+        char date[24];
+        const int length = std::snprintf(date, sizeof date, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
+        line.append(date, static_cast<size_t>(length));
+      }
+      line += ',';
+      AppendCsv(line, TagName(kind->GetType()), raw);
+      line += ',';
+      securities.Append(line, static_cast<const OESecID*>(ChildOfType(body, OE_TAG_SECID)), raw);
+      for (OETagID tag : {OE_TAG_UNITS, OE_TAG_UNITPRICE, OE_TAG_COMMISSION}) {
+        line += ',';
+        AppendKindElement(line, kind, body, tag);
+      }
+      line += ',';
+      if (amounts) AppendElement(line, amounts, amounts == body ? OE_TAG_TOTAL : OE_TAG_TRNAMT);
+      for (OETagID tag : {OE_TAG_SUBACCTSEC, OE_TAG_SUBACCTFUND, OE_TAG_SUBACCTFROM, OE_TAG_SUBACCTTO}) {
+        line += ',';
+        AppendKindElement(line, kind, body, tag);
+      }
+      line += ',';
+      if (tran) AppendCsv(line, tran->GetFITId().c_str(), raw);
+      line += ',';
+      if (tran) AppendCsv(line, tran->GetMemo().c_str(), raw);
+      line += '\n';
+      std::fwrite(line.data(), 1, line.size(), stdout);
+    }
   }
   return true;
 }

@@ -59,6 +59,8 @@ class OEBuffer {
   uint32_t GrowBuffer(uint32_t n);
 
  private:
+  static char* LargeBlock(uint32_t n);
+
   char* m_data;
   uint32_t m_allocation;
   uint32_t m_growBy;

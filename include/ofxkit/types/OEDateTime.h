@@ -10,6 +10,7 @@
 #pragma once
 
 #include <cstdint>
+#include <cstdlib>
 
 #include "ofxkit/types/OEPrecisionInteger.h"
 #include "ofxkit/types/OEString.h"
@@ -28,7 +29,9 @@ class OEDateTimeBase {
 
   OEDateTimeBase();
   OEDateTimeBase(const OEDateTimeBase& other);
-  virtual ~OEDateTimeBase();
+  virtual ~OEDateTimeBase() {
+    if (m_binary) free(m_binary);
+  }
 
   // The base reads no text form: returns 0 and does nothing.
   virtual unsigned short operator=(const char* text);

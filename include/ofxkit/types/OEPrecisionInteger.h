@@ -23,7 +23,11 @@ class OEPrecisionInteger {
   // Parses text as ConvertStringToOEPrecisionInteger does.
   explicit OEPrecisionInteger(const char* text);
   OEPrecisionInteger(const OEPrecisionInteger& other);
-  virtual ~OEPrecisionInteger();
+  // Inline: amounts are destroyed by the million, and most never made either
+  // block.
+  virtual ~OEPrecisionInteger() {
+    if (m_text || m_binary) FreeBlocks();
+  }
 
   virtual OEPrecisionInteger& operator=(const char* text);
   // Magnitude |value|, its sign (+1 for 0), decimal 0.
@@ -129,6 +133,7 @@ class OEPrecisionInteger {
   void ImportBinary(const void* src);
 
  private:
+  void FreeBlocks();
   void SetZero();
   // Adds sign x magnitude x 10^-decimal of another value (sign given apart so
   // that subtraction can pass the flipped one).

@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstdlib>
 #include <cstring>
 
 #include "ofxkit/types/OECommon.h"
@@ -29,7 +30,10 @@ class OEString {
   OEString(const char* text, size_t length);
   OEString(const OEString& other);
   OEString(OEString&& other) noexcept;
-  virtual ~OEString();
+  // Inline: a short text (the common case) has nothing to free.
+  virtual ~OEString() {
+    if (!IsInline()) free(HeapBlock());
+  }
 
   OEString& operator=(const char* text);
   virtual OEString& operator=(const OEString& other);
