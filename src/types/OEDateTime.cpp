@@ -292,7 +292,54 @@ unsigned short OEDateTimeBase::ReadTimeOfDay(const char* text) {
   return 1;
 }
 
+namespace {
+// n decimal digits at p; false at anything else.
+inline bool ReadFixedDigits(const char* p, int n, unsigned short* out) {
+  unsigned value = 0;
+  for (int i = 0; i < n; ++i) {
+    const unsigned digit = static_cast<unsigned char>(p[i]) - unsigned{'0'};
+    if (digit > 9) return false;
+    value = value * 10 + digit;
+  }
+  *out = static_cast<unsigned short>(value);
+  return true;
+}
+}  // namespace
+
+// Nearly every date of a file has one of three forms: YYYYMMDD,
+// YYYYMMDDHHMMSS or YYYYMMDDHHMMSS.XXX, with or without a zone. These are
+// read directly; -1 for any other text, which the general reader takes
+// (as it does a value out of range, so that its warning is the one logged).
+int OEDateTime::ReadCommonForm(const char* text) {
+  size_t n = 0;
+  while (n < 19 && text[n] != '\0' && text[n] != '[') ++n;
+  if (n != 8 && n != 14 && !(n == 18 && text[14] == '.')) return -1;
+  unsigned short year, month, day, hour = 0, minute = 0, second = 0, millis = 0;
+  if (!ReadFixedDigits(text, 4, &year) || !ReadFixedDigits(text + 4, 2, &month) ||
+      !ReadFixedDigits(text + 6, 2, &day))
+    return -1;
+  if (n >= 14 && (!ReadFixedDigits(text + 8, 2, &hour) || !ReadFixedDigits(text + 10, 2, &minute) ||
+                  !ReadFixedDigits(text + 12, 2, &second)))
+    return -1;
+  if (n == 18 && !ReadFixedDigits(text + 15, 3, &millis)) return -1;
+  if (text[n] != '\0' && text[n] != '[') return -1;
+  InitOEDateTime();
+  if (text[n] == '[' && !ExtractTimeZone(text + n)) return 0;  // it has logged its own warning
+  m_year = year;
+  m_month = month;
+  m_day = day;
+  m_hour = hour;
+  m_minute = minute;
+  m_second = second;
+  m_milliseconds = millis;
+  return IsValidTime() && IsValidDate() ? 1 : -1;
+}
+
 unsigned short OEDateTime::ConvertStringToOEDateTime(const char* text) {
+  if (text) {
+    const int common = ReadCommonForm(text);
+    if (common >= 0) return static_cast<unsigned short>(common);
+  }
   size_t dateLength = 0;
   while (text != nullptr && dateLength < 8 && text[dateLength] != '\0') ++dateLength;
   if (dateLength < 8) {

@@ -98,6 +98,12 @@ std::string CsvText(const char* text, bool raw, const char* field = nullptr);
 void AppendCsv(std::string& out, const char* text, bool raw, const char* field = nullptr);
 // The tag's name, or "?".
 const char* TagName(OETagID tag);
+// A date as YYYY-MM-DD, appended to out or answered.
+void AppendIsoDate(std::string& out, const OEDateTime& d);
+std::string IsoDate(const OEDateTime& d);
+// Appends the present element `tag` of an aggregate as OFX text (nothing
+// when absent); answers whether anything was appended.
+bool AppendElement(std::string& out, const OEDataObj* obj, OETagID tag);
 // Reads a password from the terminal without echo (or a line of standard
 // input when it is not a terminal).
 bool PromptPassword(const char* prompt, OEUserPassword& out);

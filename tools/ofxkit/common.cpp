@@ -283,7 +283,12 @@ void AppendCsv(std::string& out, const char* text, bool raw, const char* field) 
   AppendOutputText(out, text, std::strlen(text), field);
   if (out.size() == start) return;
   if (!raw && std::strchr("=+-@\t\r", out[start]) && out[start] != '\0') out.insert(start, 1, '\'');
-  if (out.find_first_of(",\"\r\n", start) == std::string::npos) return;
+  bool quote = false;
+  for (size_t i = start; i < out.size() && !quote; ++i) {
+    const char c = out[i];
+    quote = c == ',' || c == '"' || c == '\r' || c == '\n';
+  }
+  if (!quote) return;
   const std::string field_text = out.substr(start);
   out.resize(start);
   out += '"';
@@ -298,6 +303,40 @@ std::string CsvText(const char* text, bool raw, const char* field) {
   std::string out;
   AppendCsv(out, text, raw, field);
   return out;
+}
+
+void AppendIsoDate(std::string& out, const OEDateTime& d) {
+  char text[16];
+  char* p = text + sizeof text;
+  const unsigned parts[] = {d.GetDay(), d.GetMonth()};
+  for (unsigned part : parts) {
+    *--p = static_cast<char>('0' + part % 10);
+    *--p = static_cast<char>('0' + part / 10 % 10);
+    *--p = '-';
+  }
+  unsigned year = d.GetYear();
+  int digits = 0;
+  do {
+    *--p = static_cast<char>('0' + year % 10);
+    year /= 10;
+  } while (++digits < 4 || year != 0);
+  out.append(p, static_cast<size_t>(text + sizeof text - p));
+}
+
+std::string IsoDate(const OEDateTime& d) {
+  std::string text;
+  AppendIsoDate(text, d);
+  return text;
+}
+
+bool AppendElement(std::string& out, const OEDataObj* obj, OETagID tag) {
+  const auto* agg = static_cast<const OEAggregate*>(obj);  // every object these commands read is one
+  const OEFieldDesc* d = agg ? agg->FieldAt(tag) : nullptr;
+  if (!d || !d->text || !agg->ValidateTag(tag)) return false;
+  thread_local OEString text;
+  if (!d->text(agg, 0, text)) return false;
+  out.append(text.c_str(), text.GetStrLength());
+  return text.GetStrLength() != 0;
 }
 
 const char* TagName(OETagID tag) {

@@ -24,18 +24,6 @@ const char kPositionsHelp[] =
     "could not be read are reported on standard error, and the exit status is\n"
     "then never 0. Exit status as for 'ofxkit dump'.\n";
 
-// Appends the present element `tag` of an aggregate as OFX text; nothing
-// when absent. Answers whether anything was appended.
-bool AppendElement(std::string& out, const OEDataObj* obj, OETagID tag) {
-  const auto* agg = static_cast<const OEAggregate*>(obj);  // every object these commands read is one
-  const OEFieldDesc* d = agg ? agg->FieldAt(tag) : nullptr;
-  if (!d || !d->text || !agg->ValidateTag(tag)) return false;
-  thread_local OEString text;
-  if (!d->text(agg, 0, text)) return false;
-  out.append(text.c_str(), text.GetStrLength());
-  return text.GetStrLength() != 0;
-}
-
 // The present element `tag` of an aggregate as OFX text; empty when absent.
 std::string ElementText(const OEDataObj* obj, OETagID tag) {
   std::string text;
@@ -62,12 +50,6 @@ const OEDataObj* TransactionBody(const OEDataObj* kind) {
 // has none.
 void AppendKindElement(std::string& out, const OEDataObj* kind, const OEDataObj* body, OETagID tag) {
   if (!AppendElement(out, body, tag) && body != kind) AppendElement(out, kind, tag);
-}
-
-std::string IsoDate(const OEDateTime& d) {
-  char text[24];
-  std::snprintf(text, sizeof text, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
-  return text;
 }
 
 // The securities that the file's security lists describe, by id.
@@ -201,12 +183,7 @@ bool PrintInvestmentTransactions(OEDataObj* root, bool withAccount, bool raw, bo
       const OEDataObj* amounts =
           kind->GetType() == OE_TAG_INVBANKTRAN ? static_cast<OEInvBankTran*>(kind)->GetStatementTx() : body;
       line.assign(account);
-      if (row.dated) {
-        const OEDateTime& d = tran->GetDtTrade();
-        char date[24];
-        const int length = std::snprintf(date, sizeof date, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
-        line.append(date, static_cast<size_t>(length));
-      }
+      if (row.dated) AppendIsoDate(line, tran->GetDtTrade());
       line += ',';
       AppendCsv(line, TagName(kind->GetType()), raw);
       line += ',';

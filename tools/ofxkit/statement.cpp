@@ -23,19 +23,6 @@ const char kStatementHelp[] =
     "Transactions of the file that could not be read are reported on standard\n"
     "error, and the exit status is then never 0. Exit status as for 'ofxkit dump'.\n";
 
-std::string IsoDate(const OEBankStatementTx& tx) {
-  if (!tx.ValidateTag(OE_TAG_DTPOSTED)) return "";
-  const OEDateTime& d = tx.GetDateTimePosted();
-  char text[24];
-  std::snprintf(text, sizeof text, "%04u-%02u-%02u", d.GetYear(), d.GetMonth(), d.GetDay());
-  return text;
-}
-
-std::string Amount(const OEBankStatementTx& tx) {
-  OEString text;
-  return tx.ValidateTag(OE_TAG_TRNAMT) && OEValueText(tx.GetTxAmount(), text) ? text.c_str() : "";
-}
-
 std::string AccountName(const OEGenericStatementRs& rs) {
   const OEBankOrCCAccount* account = rs.GetAccountFrom();
   if (!account) return "";
@@ -60,15 +47,26 @@ int CmdStatement(int argc, char** argv) {
     const OEBankTransactionList* list = rs->GetBankTransactionList();
     if (!list) continue;
     std::string account = withAccount ? CsvText(AccountName(*rs).c_str(), raw) + "," : "";
+    std::string line;
     for (unsigned short i = 0; i < list->GetNumStatementTx(); ++i) {
       const OEBankStatementTx* tx = list->GetStatementTx(i);
       if (!tx) continue;
-      const char* type = tx->ValidateTag(OE_TAG_TRNTYPE) ? OEDataConversion::Text(tx->GetTxType()) : "";
-      std::printf("%s%s,%s,%s,%s,%s,%s,%s\n", account.c_str(), IsoDate(*tx).c_str(), Amount(*tx).c_str(),
-                  CsvText(type, raw).c_str(), CsvText(tx->GetFITId(), raw, "FITID").c_str(),
-                  CsvText(tx->GetName(), raw, "NAME").c_str(),
-                  CsvText(tx->GetMemo(), raw, "MEMO").c_str(),
-                  CsvText(tx->GetCheckNum(), raw, "CHEQUENUM").c_str());
+      line.assign(account);
+      if (tx->ValidateTag(OE_TAG_DTPOSTED)) AppendIsoDate(line, tx->GetDateTimePosted());
+      line += ',';
+      AppendElement(line, tx, OE_TAG_TRNAMT);
+      line += ',';
+      AppendCsv(line, tx->ValidateTag(OE_TAG_TRNTYPE) ? OEDataConversion::Text(tx->GetTxType()) : "", raw);
+      line += ',';
+      AppendCsv(line, tx->GetFITId(), raw, "FITID");
+      line += ',';
+      AppendCsv(line, tx->GetName(), raw, "NAME");
+      line += ',';
+      AppendCsv(line, tx->GetMemo(), raw, "MEMO");
+      line += ',';
+      AppendCsv(line, tx->GetCheckNum(), raw, "CHEQUENUM");
+      line += '\n';
+      std::fwrite(line.data(), 1, line.size(), stdout);
     }
   }
   bool investments = PrintInvestmentTransactions(parsed.file.get(), withAccount, raw, !statements.empty());

@@ -217,6 +217,9 @@ class OEDateTime : public OEDateTimeBase {
   unsigned short DaysInMonth() const { return OEDateTimeBase::DaysInMonth(m_month, m_year); }
   // Month 1-12 and day 1 to the length of that month.
   unsigned short IsValidDate() const;
+
+ private:
+  int ReadCommonForm(const char* text);
 };
 
 class OETime : public OEDateTimeBase {
