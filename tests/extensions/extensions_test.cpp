@@ -341,6 +341,19 @@ TEST_F(ExtensionsTest, BadValuesWarnAndStayAbsent) {
   EXPECT_EQ(fresh.ValidateTag(OE_TAG_VEXA_BIDREF1), 0);
   log->DeleteAll();
 
+  // Texts the maker gives no limit are kept whole without a word; a feature
+  // name longer than its 32 characters is kept whole too, and reported.
+  const std::string longText(2000, 'm');
+  EXPECT_EQ(fresh.SetFIMessage(OEString(longText.c_str())), 1);
+  EXPECT_EQ(fresh.GetFIMessage().GetStrLength(), 2000u);
+  EXPECT_EQ(log->Entries(), 0);
+  OEVexaBrowserCentric feature;
+  EXPECT_EQ(feature.SetVexaWebFeatureName(OEString(longText.substr(0, 33).c_str())), 1);
+  EXPECT_EQ(feature.GetVexaWebFeatureName().GetStrLength(), 33u);
+  EXPECT_EQ(feature.ValidateTag(OE_TAG_VEXA_WEBFEATURENM), 1);
+  EXPECT_EQ(Count(OEPW_TOOLONG), 1);
+  log->DeleteAll();
+
   // In a parse: the bad status is logged with its tag and the text, and the
   // tag stays absent, so the aggregate is reported incomplete.
   std::string text = Details();
