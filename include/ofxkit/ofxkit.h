@@ -46,6 +46,9 @@
 #include "ofxkit/messages/xfer/OEXferProfile.h"
 #include "ofxkit/messages/xfer/OETransfer.h"
 #include "ofxkit/messages/xfer/OEWire.h"
+#include "ofxkit/extensions/OEVexaDataConversion.h"
+#include "ofxkit/extensions/OEVexaBrand.h"
+#include "ofxkit/extensions/OEVexaUsage.h"
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/parse/OEParser.h"

@@ -92,9 +92,11 @@ class OEQuietConversion {
 template <class T, class Enable = void>
 struct OEValueTraits;
 
-// Enumerations of OEDataConversion.
+// Enumerations of OEDataConversion. An enumeration whose reading differs
+// (a service list's empty entry) specialises OEValueTraits and derives from
+// OEEnumValueTraits for the rest.
 template <class E>
-struct OEValueTraits<E, std::enable_if_t<std::is_enum<E>::value>> {
+struct OEEnumValueTraits {
   static bool FromText(const OEString& text, E& value) {
     int32_t found = OEDataConversion::FindText(text.c_str(), text.GetStrLength(), OEEnumTraits<E>::kFirstMatched,
                                                OEEnumTraits<E>::kCount - 1, OEEnumTraits<E>::Texts());
@@ -111,6 +113,8 @@ struct OEValueTraits<E, std::enable_if_t<std::is_enum<E>::value>> {
     return text != nullptr;
   }
 };
+template <class E>
+struct OEValueTraits<E, std::enable_if_t<std::is_enum<E>::value>> : OEEnumValueTraits<E> {};
 
 // The OFX text of a typed value, for display and export (not for writing
 // OFX, which the builder does): 1 when the value has one.

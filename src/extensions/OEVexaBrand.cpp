@@ -1,0 +1,64 @@
+#include "ofxkit/extensions/OEVexaBrand.h"
+
+#include "ofxkit/parse/OEParseLogger.h"
+
+bool OEValueTraits<OEVexaService>::FromText(const OEString& text, OEVexaService& value) {
+  if (text.GetStrLength() == 0) {
+    OELogWarning(OEPW_NULLPOINTER, text, OEString(), OE_TAG_VEXA_SVC, nullptr);
+    return false;
+  }
+  return OEEnumValueTraits<OEVexaService>::FromText(text, value);
+}
+
+OE_DEFINE_AGGREGATE(OEVexaSoftware, OEAggregate, OE_VEXASOFTWARE_FIELDS, VEXA_SW,
+                    .Valid(OE_TAGS(VEXA_SWPRODCD, VEXA_SWVER, VEXA_SWOSCD, VEXA_DISTMETHOD))
+                    .Required(OE_TAGS(VEXA_SWPRODCD, VEXA_SWVER, VEXA_SWOSCD)))
+OE_DEFINE_AGGREGATE(OEVexaBIDInfo, OEAggregate, OE_VEXABIDINFO_FIELDS, VEXA_BIDINFO,
+                    .Valid(OE_TAGS(VEXA_BID, VEXA_DTUPDATE))
+                    .Required(OE_TAGS(VEXA_BID, VEXA_DTUPDATE)))
+OE_DEFINE_AGGREGATE(OEVexaSelectByBID, OEAggregate, OE_VEXASELECTBYBID_FIELDS, VEXA_SELECTBYBID,
+                    .Valid(OE_TAGS(VEXA_BIDINFO))
+                    .Required(OE_TAGS(VEXA_BIDINFO)))
+OE_DEFINE_AGGREGATE(OEVexaServiceList, OEAggregate, OE_VEXASERVICELIST_FIELDS, VEXA_SVCLIST,
+                    .Valid(OE_TAGS(VEXA_SVC))
+                    .Required(OE_TAGS(VEXA_SVC)))
+OE_DEFINE_AGGREGATE(OEVexaSPURLList, OEAggregate, OE_VEXASPURLLIST_FIELDS, VEXA_SPURLLIST,
+                    .Valid(OE_TAGS(VEXA_SPURL)))
+OE_DEFINE_AGGREGATE(OEVexaSPChange, OEAggregate, OE_VEXASPCHANGE_FIELDS, VEXA_SPCHANGE,
+                    .Valid(OE_TAGS(VEXA_SPPROFILEURL, VEXA_BEGINDT))
+                    .Required(OE_TAGS(VEXA_SPPROFILEURL, VEXA_BEGINDT)))
+OE_DEFINE_AGGREGATE(OEVexaBrowserCentric, OEAggregate, OE_VEXABROWSERCENTRIC_FIELDS, VEXA_BROWSERCENTRIC,
+                    .Valid(OE_TAGS(VEXA_WEBFEATURENM, VEXA_ACCESSMETHOD, VEXA_LOGINURL))
+                    .Required(OE_TAGS(VEXA_WEBFEATURENM, VEXA_ACCESSMETHOD, VEXA_LOGINURL)))
+OE_DEFINE_AGGREGATE(OEVexaBrandDetails, OEAggregate, OE_VEXABRANDDETAILS_FIELDS, VEXA_BRANDDETAILS,
+                    .Valid(OE_TAGS(FI, VEXA_SVCLIST, VEXA_SPURLLIST, VEXA_BRANDNAME, VEXA_STATUS, VEXA_NPCFLAG,
+                                   VEXA_MKTTIERTYPE, VEXA_MKTTIERCD, VEXA_MKTDISTMETHOD, VEXA_BIDREF1, ADDR1, ADDR2,
+                                   CITY, STATE, POSTALCODE, COUNTRY, CSPHONE, TSPHONE, FAXPHONE, URL, EMAIL,
+                                   VEXA_BRANDCATEGORY, VEXA_FIPROFILEURL, VEXA_FIMKTINDEXFILEURL, VEXA_TRADINGURL,
+                                   VEXA_DISTNAME, VEXA_FISHORTNM, VEXA_PROFCERTID, VEXA_USERSPECIFICPROF,
+                                   VEXA_ENROLLURL, VEXA_FIMESSAGE, VEXA_NEWPROFILEURL, VEXA_SPCHANGE,
+                                   VEXA_BROWSERCENTRIC))
+                    .Required(OE_TAGS(VEXA_SVCLIST, VEXA_SPURLLIST, VEXA_BRANDNAME, VEXA_STATUS, VEXA_NPCFLAG,
+                                      VEXA_MKTTIERTYPE, VEXA_MKTTIERCD, ADDR1, CITY, STATE, POSTALCODE, COUNTRY,
+                                      CSPHONE, URL, VEXA_FIPROFILEURL)))
+OE_DEFINE_AGGREGATE(OEVexaBrandData, OEAggregate, OE_VEXABRANDDATA_FIELDS, VEXA_BRANDDATA,
+                    .Valid(OE_TAGS(VEXA_BIDINFO, VEXA_BRANDDETAILS))
+                    .Required(OE_TAGS(VEXA_BIDINFO)))
+OE_DEFINE_AGGREGATE(OEVexaBrandDataList, OEAggregate, OE_VEXABRANDDATALIST_FIELDS, VEXA_BRANDDATALIST,
+                    .Valid(OE_TAGS(VEXA_BRANDDATA))
+                    .Required(OE_TAGS(VEXA_BRANDDATA)))
+OE_DEFINE_AGGREGATE(OEVexaBrandRq, OETransBase, OE_VEXABRANDRQ_FIELDS, VEXA_BRANDRQ,
+                    .Valid(OE_TAGS(VEXA_SW, VEXA_SELECTBYBID))
+                    .Required(OE_TAGS(VEXA_SW, VEXA_SELECTBYBID)))
+OE_DEFINE_AGGREGATE(OEVexaBrandRs, OETransBase, OE_VEXABRANDRS_FIELDS, VEXA_BRANDRS,
+                    .Valid(OE_TAGS(VEXA_SW, VEXA_BRANDDATALIST))
+                    .Required(OE_TAGS(VEXA_SW, VEXA_BRANDDATALIST)))
+OE_DEFINE_AGGREGATE(OEVexaTierDef, OEAggregate, OE_VEXATIERDEF_FIELDS, VEXA_TIERDEF,
+                    .Valid(OE_TAGS(VEXA_TIERTYPE, VEXA_TIERCD, VEXA_DISTMETHOD, VEXA_FEATURENM))
+                    .Required(OE_TAGS(VEXA_TIERTYPE, VEXA_TIERCD)))
+OE_DEFINE_AGGREGATE(OEVexaMktTierRq, OETransBase, OE_VEXAMKTTIERRQ_FIELDS, VEXA_MKTTIERRQ,
+                    .Valid(OE_TAGS(VEXA_TIERDTUPDATE))
+                    .Required(OE_TAGS(VEXA_TIERDTUPDATE)))
+OE_DEFINE_AGGREGATE(OEVexaMktTierRs, OETransBase, OE_VEXAMKTTIERRS_FIELDS, VEXA_MKTTIERRS,
+                    .Valid(OE_TAGS(VEXA_TIERDEF, VEXA_TIERDTUPDATE))
+                    .Required(OE_TAGS(VEXA_TIERDTUPDATE)))
