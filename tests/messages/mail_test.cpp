@@ -35,6 +35,9 @@ OE_DEFINE_AGGREGATE(MailRoot, OEAggregate, T_MAIL_ROOT_FIELDS, NONE,
 
 const char kChecking[] = "<BANKACCTFROM><BANKID>121000248<ACCTID>1001<ACCTTYPE>CHECKING</BANKACCTFROM>";
 const char kCard[] = "<CCACCTFROM><ACCTID>4111</CCACCTFROM>";
+const char kSignOn[] =
+    "<SIGNONMSGSRQV1><SONRQ><DTCLIENT>20240115<USERID>jdoe<USERPASS>x<LANGUAGE>ENG<APPID>QWIN<APPVER>2700</SONRQ>"
+    "</SIGNONMSGSRQV1>";
 const char kBrokerage[] = "<INVACCTFROM><BROKERID>broker.example<ACCTID>X123</INVACCTFROM>";
 
 // A message as a server writes one: the body with its end tag.
@@ -475,6 +478,59 @@ TEST_F(MailTest, ResponseWithMailOfEverySetParsesFullyAndRoundTrips) {
   std::vector<const OEMailBase*> mailsAgain;
   Collect(&again, mailsAgain);
   ASSERT_EQ(mailsAgain.size(), 8u);
+}
+
+// A request document as a mail client sends one: each kind of mail request
+// in its wrapper or sync wrapper, in the message set its request belongs to.
+TEST_F(MailTest, RequestDocumentWithMailWrappersAndSyncs) {
+  EXPECT_EQ(OEMessageSetRq::MsgIDToMsgSetID(OE_TAG_BANKMAILRQ), OE_TAG_BANKMSGSET);
+  EXPECT_EQ(OETransRq::MsgIDToTranWrapper(OE_TAG_BANKMAILRQ), OE_TAG_BANKMAILTRNRQ);
+  EXPECT_EQ(OETransRq::MsgIDToTranWrapper(OE_TAG_PMTMAILRQ), OE_TAG_PMTMAILTRNRQ);
+  EXPECT_EQ(OETransRq::MsgIDToTranWrapper(OE_TAG_INVMAILRQ), OE_TAG_INVMAILTRNRQ);
+
+  const std::string text =
+      "<OFX>" + std::string(kSignOn) + "<BANKMSGSRQV1><BANKMAILSYNCRQ><TOKEN>0<REJECTIFMISSING>N" + kChecking +
+      "<INCIMAGES>N<USEHTML>N<BANKMAILTRNRQ><TRNUID>1<BANKMAILRQ>" + kChecking + Mail() +
+      "</BANKMAILRQ></BANKMAILTRNRQ></BANKMAILSYNCRQ></BANKMSGSRQV1>"
+      "<INVSTMTMSGSRQV1><INVMAILTRNRQ><TRNUID>2<INVMAILRQ>" + kBrokerage + Mail() +
+      "</INVMAILRQ></INVMAILTRNRQ></INVSTMTMSGSRQV1>"
+      "<BILLPAYMSGSRQV1><PMTMAILTRNRQ><TRNUID>3<PMTMAILRQ>" + Mail() +
+      "</PMTMAILRQ></PMTMAILTRNRQ></BILLPAYMSGSRQV1>"
+      "<EMAILMSGSRQV1><MAILSYNCRQ><TOKEN>0<REJECTIFMISSING>N<INCIMAGES>N<USEHTML>N<MAILTRNRQ><TRNUID>4<MAILRQ>" + Mail() +
+      "</MAILRQ></MAILTRNRQ></MAILSYNCRQ><GETMIMETRNRQ><TRNUID>5<GETMIMERQ><URL>https://ofx.example.com/m/1"
+      "</GETMIMERQ></GETMIMETRNRQ></EMAILMSGSRQV1></OFX>";
+  OERequest request;
+  ASSERT_EQ(ParseText(text, &request, 1), OE_PARSE_OK);
+  EXPECT_EQ(log->Entries(), 0);
+  std::vector<const OEMailBase*> mails;
+  Collect(&request, mails);
+  EXPECT_EQ(mails.size(), 4u);
+  std::vector<const OEGetMimeRq*> mime;
+  Collect(&request, mime);
+  EXPECT_EQ(mime.size(), 1u);
+
+  OEDataObj* where = &request;
+  OETagID missing = OE_TAG_NONE;
+  EXPECT_EQ(OEUtility::AllRequiredPresent(&where, &missing), 1);
+  WrittenText strict = WriteUnderOwnTag(request, OE_BUILD_STRICT, 1);
+  ASSERT_EQ(strict.status, OE_BUILD_OK);
+  OERequest again;
+  ASSERT_EQ(ParseText(strict.text, &again, 1), OE_PARSE_OK);
+  EXPECT_EQ(WriteUnderOwnTag(again, OE_BUILD_STRICT).text, strict.text);
+
+  // A bank mail request naming two accounts is read whole, and the check
+  // finds it.
+  OERequest twoAccounts;
+  ASSERT_EQ(ParseText("<OFX>" + std::string(kSignOn) + "<BANKMSGSRQV1><BANKMAILTRNRQ><TRNUID>1<BANKMAILRQ>" + kChecking + kCard +
+                          Mail() + "</BANKMAILRQ></BANKMAILTRNRQ></BANKMSGSRQV1></OFX>",
+                      &twoAccounts),
+            OE_PARSE_OK);
+  std::vector<const OEBankMailRq*> bank;
+  Collect(&twoAccounts, bank);
+  ASSERT_EQ(bank.size(), 1u);
+  where = &twoAccounts;
+  EXPECT_EQ(OEUtility::AllRequiredPresent(&where, &missing), 0);
+  EXPECT_EQ(where, bank[0]);
 }
 
 // Every inner mail request and response is made by the factory as the class
