@@ -99,7 +99,8 @@ class MailTest : public LogFixture {
   }
   unsigned short Count(OEParseWarning code) const {
     unsigned short n = 0;
-    for (unsigned short i = 0; i < log->Entries(); ++i) n = static_cast<unsigned short>(n + (log->Get(i)->warning == code));
+    for (unsigned short i = 0; i < log->Entries(); ++i)
+      if (log->Get(i)->warning == code) ++n;
     return n;
   }
   std::unique_ptr<MailRoot> root_;
@@ -496,7 +497,8 @@ TEST_F(MailTest, RequestDocumentWithMailWrappersAndSyncs) {
       "</INVMAILRQ></INVMAILTRNRQ></INVSTMTMSGSRQV1>"
       "<BILLPAYMSGSRQV1><PMTMAILTRNRQ><TRNUID>3<PMTMAILRQ>" + Mail() +
       "</PMTMAILRQ></PMTMAILTRNRQ></BILLPAYMSGSRQV1>"
-      "<EMAILMSGSRQV1><MAILSYNCRQ><TOKEN>0<REJECTIFMISSING>N<INCIMAGES>N<USEHTML>N<MAILTRNRQ><TRNUID>4<MAILRQ>" + Mail() +
+      "<EMAILMSGSRQV1><MAILSYNCRQ><TOKEN>0<REJECTIFMISSING>N<INCIMAGES>N<USEHTML>N"
+      "<MAILTRNRQ><TRNUID>4<MAILRQ>" + Mail() +
       "</MAILRQ></MAILTRNRQ></MAILSYNCRQ><GETMIMETRNRQ><TRNUID>5<GETMIMERQ><URL>https://ofx.example.com/m/1"
       "</GETMIMERQ></GETMIMETRNRQ></EMAILMSGSRQV1></OFX>";
   OERequest request;
@@ -521,8 +523,8 @@ TEST_F(MailTest, RequestDocumentWithMailWrappersAndSyncs) {
   // A bank mail request naming two accounts is read whole, and the check
   // finds it.
   OERequest twoAccounts;
-  ASSERT_EQ(ParseText("<OFX>" + std::string(kSignOn) + "<BANKMSGSRQV1><BANKMAILTRNRQ><TRNUID>1<BANKMAILRQ>" + kChecking + kCard +
-                          Mail() + "</BANKMAILRQ></BANKMAILTRNRQ></BANKMSGSRQV1></OFX>",
+  ASSERT_EQ(ParseText("<OFX>" + std::string(kSignOn) + "<BANKMSGSRQV1><BANKMAILTRNRQ><TRNUID>1<BANKMAILRQ>" +
+                          kChecking + kCard + Mail() + "</BANKMAILRQ></BANKMAILTRNRQ></BANKMSGSRQV1></OFX>",
                       &twoAccounts),
             OE_PARSE_OK);
   std::vector<const OEBankMailRq*> bank;

@@ -41,7 +41,9 @@ struct OEMailBodyOps {
     OEBuildStatus status = b->AddTagOEString(tag, static_cast<const C*>(self)->*M);
     return status != OE_BUILD_OK ? status : b->AddTagEnd(tag);
   }
-  static void Copy(OEAggregate* dst, const OEAggregate* src) { static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M; }
+  static void Copy(OEAggregate* dst, const OEAggregate* src) {
+    static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M;
+  }
   static unsigned short Text(const OEAggregate* self, unsigned short, OEString& out) {
     out = static_cast<const C*>(self)->*M;
     return 1;
