@@ -37,6 +37,7 @@
 #include "ofxkit/messages/invest/OEInvLists.h"
 #include "ofxkit/messages/invest/OEInvStatement.h"
 #include "ofxkit/messages/mail/OEEMailProfile.h"
+#include "ofxkit/messages/mail/OEMail.h"
 #include "ofxkit/messages/profile/OEMessageSetCore.h"
 #include "ofxkit/messages/profile/OEMessageSetVersion.h"
 #include "ofxkit/messages/profile/OEProfile.h"

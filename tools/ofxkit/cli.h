@@ -59,6 +59,8 @@ struct ParsedFile {
   ~ParsedFile();
 };
 
+// The time now (UTC), to the second.
+OEDateTime NowUTC();
 // Reads a whole file; false with a message when it cannot.
 bool ReadFile(const std::string& path, OEBuffer& buffer, std::string* error);
 // Writes a file, or standard output for "-". A private file (one holding a
@@ -118,8 +120,14 @@ struct StatementRequestOptions {
   // What is asked besides the sign-on: "statement", "profile" or "accounts"
   // (since: the date of the last account list the client holds).
   std::string kind = "statement", since;
-  // Transfers and payments: the options of kMoveOptionNames that were given.
+  // Transfers, payments and mail: the options of kMoveOptionNames and
+  // kMailOptionNames that were given.
   std::map<std::string, std::string> values;
+  // The value of one of them, or "" when it was not given.
+  std::string Value(const char* name) const {
+    auto found = values.find(name);
+    return found == values.end() ? std::string() : found->second;
+  }
 };
 
 // The options of `request transfer` and `request payment` beyond the sign-on
@@ -127,6 +135,8 @@ struct StatementRequestOptions {
 constexpr const char* kMoveOptionNames[] = {"to-account", "to-bank-id", "to-type", "amount", "due", "memo",
                                             "pay-account", "payee-id", "payee-name", "payee-addr1",
                                             "payee-city", "payee-state", "payee-postal", "payee-phone"};
+// The options of `request mail`: the message and where its body is read from.
+constexpr const char* kMailOptionNames[] = {"subject", "body-file", "to", "from"};
 // Writes a sign-on + statement request file into out; false (with a message
 // on standard error) when an option is not valid.
 bool BuildStatementRequest(const StatementRequestOptions& options, const OEUserPassword& password, OEBuffer& out);
@@ -143,6 +153,10 @@ OETransRs* AnswerWrapper(const OETransRq& wrapper, OETagID type, OETagID innerTa
 // Adds the transfer or payment request that options name; false after a
 // message when an option is missing or not valid.
 bool AppendMoveRequest(const StatementRequestOptions& options, OERequest& request);
+// Adds the secure-mail request that options name (free-form, or about the
+// bank, card or brokerage account they name); false after a message, which
+// never holds the body.
+bool AppendMailRequest(const StatementRequestOptions& options, OERequest& request);
 // Adds the profile or account-information request that options name.
 bool AppendFirstContactRequest(const StatementRequestOptions& options, OERequest& request);
 // Writes a request file strictly into out; false after a message.
@@ -203,6 +217,10 @@ bool AnswerInvestmentSet(const OEMessageSetRq& set, unsigned transactions, Answe
 // each with a processing status and a server transaction id; false for a set
 // whose other requests are still to answer (bank sets), or of another type.
 bool AnswerMoveSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);
+// Answers the secure-mail requests of an e-mail, bank or brokerage set into
+// out, each with a reply from the institution; true for an e-mail set (whose
+// requests are all answered then), false for the others.
+bool AnswerMailSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);
 // Answers a profile or signup request set into out; false for a set of
 // another type.
 bool AnswerFirstContactSet(const OEMessageSetRq& set, AnswerBudget& budget, OEResponse& out);

@@ -44,14 +44,24 @@ const char kRequestHelp[] =
     "                              [--password-stdin] [-o FILE]\n"
     "Moving money: an intrabank transfer from one account to another of the same\n"
     "bank, or a bill payment to a payee named by the institution's id or by name and\n"
-    "address. Without --due the money moves today.\n";
+    "address. Without --due the money moves today.\n"
+    "\n"
+    "usage: ofxkit request mail --org ORG --fid FID --user USER --subject TEXT --body-file FILE\n"
+    "                           [--to NAME] [--from NAME]\n"
+    "                           [--bank-id ROUTING --account ACCT [--type CHECKING|SAVINGS|...|CREDITCARD]\n"
+    "                            | --broker-id ID --account ACCT] [--password-stdin] [-o FILE]\n"
+    "A secure message to the institution, its body read from FILE: free-form, or\n"
+    "about the bank, card (--type CREDITCARD, no --bank-id) or brokerage account\n"
+    "named. --from defaults to the user, --to to the institution.\n";
 
 bool Fail(const std::string& message) {
   std::fprintf(stderr, "ofxkit request: %s\n", message.c_str());
   return false;
 }
 
-OEDateTime Today() {
+}  // namespace
+
+OEDateTime NowUTC() {
   std::time_t now = std::time(nullptr);
   std::tm utc{};
   gmtime_r(&now, &utc);
@@ -59,8 +69,6 @@ OEDateTime Today() {
                     static_cast<short>(utc.tm_mday), static_cast<short>(utc.tm_hour),
                     static_cast<short>(utc.tm_min), static_cast<short>(utc.tm_sec));
 }
-
-}  // namespace
 
 bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPassword& password, OEBuffer& out) {
   OEFileRq file;
@@ -73,7 +81,7 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
   request->AppendMessageSet(signOnSet);
   OESignOnRq* signOn = new OESignOnRq();
   signOnSet->SetSignOnRq(signOn);
-  signOn->SetDtClient(Today());
+  signOn->SetDtClient(NowUTC());
   signOn->SetUserId(o.user.c_str());
   signOn->SetUserPass(password);
   signOn->SetLanguage(OEString("ENG"));
@@ -85,6 +93,7 @@ bool BuildStatementRequest(const StatementRequestOptions& o, const OEUserPasswor
   if (!signOn->SetAppVer(OEString(o.appVersion.c_str()))) return Fail("--app-version must be a number like 2700");
 
   if (o.kind == "transfer" || o.kind == "payment") return AppendMoveRequest(o, *request) && WriteRequest(file, out);
+  if (o.kind == "mail") return AppendMailRequest(o, *request) && WriteRequest(file, out);
   if (o.kind != "statement") return AppendFirstContactRequest(o, *request) && WriteRequest(file, out);
   if (o.type == "INVESTMENT") return AppendInvestmentRequest(o, *request) && WriteRequest(file, out);
   bool card = o.type == "CARD";
@@ -154,7 +163,7 @@ int CmdRequest(int argc, char** argv) {
   Args args(argc, argv, 2);
   const bool known = argc >= 3 && (!std::strcmp(argv[2], "statement") || !std::strcmp(argv[2], "profile") ||
                                    !std::strcmp(argv[2], "accounts") || !std::strcmp(argv[2], "transfer") ||
-                                   !std::strcmp(argv[2], "payment"));
+                                   !std::strcmp(argv[2], "payment") || !std::strcmp(argv[2], "mail"));
   if (args.Flag("help") || !known) {
     bool asked = argc >= 3 && (!std::strcmp(argv[2], "--help") || known);
     std::fputs(kRequestHelp, asked ? stdout : stderr);
@@ -184,6 +193,8 @@ int CmdRequest(int argc, char** argv) {
   o.since = options.Option("since");
   o.end = options.Option("end");
   for (const char* name : kMoveOptionNames)
+    if (options.HasOption(name)) o.values[name] = options.Option(name);
+  for (const char* name : kMailOptionNames)
     if (options.HasOption(name)) o.values[name] = options.Option(name);
   o.appId = options.Option("app-id");
   if (o.appId.empty()) o.appId = "QWIN";

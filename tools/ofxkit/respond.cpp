@@ -176,7 +176,7 @@ bool AnswerRequest(const OEFileRq& request, const RespondOptions& options, OEFil
         out->AppendMessageSet(rsSet);
         continue;
       }
-      if (signedOn && (AnswerInvestmentSet(*set, options.transactions, budget, *out) ||
+      if (signedOn && (AnswerMailSet(*set, budget, *out) || AnswerInvestmentSet(*set, options.transactions, budget, *out) ||
                        AnswerFirstContactSet(*set, budget, *out) || AnswerMoveSet(*set, budget, *out)))
         continue;
       bool card = set->GetType() == OE_TAG_CREDITCARDMSGSRQV1;
