@@ -139,10 +139,21 @@ unsigned short OEPayrollAmount::FormatPayrollText(char* out) const {
     out[0] = '\0';
     return 0;
   }
+  // A fraction of a unit is written with its leading zero ("$0.50").
+  const char* point = number[0] == '-' ? number + 1 : number;
+  bool leadingZero = *point == '.';
+  if (length + marks + (leadingZero ? 1 : 0) > kMaxTextLength) {
+    out[0] = '\0';
+    return 0;
+  }
   char* o = out;
   if (m_dollarKind) *o++ = '$';
-  std::memcpy(o, number, length);
-  o += length;
+  size_t signLength = static_cast<size_t>(point - number);
+  std::memcpy(o, number, signLength);
+  o += signLength;
+  if (leadingZero) *o++ = '0';
+  std::memcpy(o, point, length - signLength);
+  o += length - signLength;
   if (m_percent) *o++ = '%';
   *o = '\0';
   return static_cast<unsigned short>(o - out);

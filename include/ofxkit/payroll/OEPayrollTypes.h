@@ -81,9 +81,9 @@ class OEPayrollAmount : public OEPrecisionInteger {
   // Answers 1 when the text was clean.
   unsigned short ConvertStringToOEPrecisionInteger(const char* text) override;
 
-  // The text: the marker, or "$" number, number "%", or the number; null
-  // when it would not fit 30 characters. Kept in the object until the next
-  // call.
+  // The text: the marker, or "$" number, number "%", or the number (a
+  // fraction of a unit with its leading zero: "$0.50"); null when it would
+  // not fit 30 characters. Kept in the object until the next call.
   operator char*() override;
   // The same text into out (at least kMaxTextLength + 1 bytes); its length,
   // or 0 when there is none.
