@@ -53,8 +53,11 @@ class OEHealthCare : public OEAggregate {
   X(VALUE, HoursPerPeriod, V_HRSPERPD, OEPayrollAmount)         \
   X(LIST, Wage, V_WAGE, OEWage)                                 \
   X(LIST, Adjustment, V_ADJ, OEPayrollAdjustment)               \
-  X(CHILD, HealthCare, V_HEALTHCARE, OEHealthCare)
+  X(CHILD, HealthCare, V_HEALTHCARE, OEHealthCare)               \
+  X(ALSO, HealthCare, V_HEALTHCARE_2, OEHealthCare)
 
+// "V.HEALTHCARE" has two ids in the vocabulary; a lookup by name may give
+// either, so the health care child stands under both.
 class OEPayroll : public OEAggregate {
   OE_AGGREGATE(OEPayroll, OE_PAYROLL_FIELDS)
 };
