@@ -554,6 +554,45 @@ TEST_F(PayrollAggregateTest, UpdateRequestFileRoundTrip) {
   EXPECT_EQ(WrittenFile(again, plain), written);
 }
 
+TEST_F(PayrollAggregateTest, UpdateResponseBuiltByTheApplication) {
+  OEPayrollUpdateRs* update = new OEPayrollUpdateRs;
+  update->SetToken("7");
+  update->SetPayCheckNextID("PC-1");
+  update->SetPayrollTxNextID("TX-1");
+  update->SetEmployeeNextID("E-1");
+  EXPECT_EQ(update->GetFirstMissingRequiredTag(OE_TAG_NONE), OE_TAG_V_PITEMNEXTID);
+  update->SetPayrollItemNextID("1");
+  OEDirectDepositStatus* dd = new OEDirectDepositStatus;
+  dd->SetDirectDepositMode(OE_DDMODE_APPLIED);
+  ASSERT_EQ(update->SetDirectDepositStatus(dd), 1);
+  OETransRs* wrapper = new OETransRs;
+  wrapper->SetType(OE_TAG_V_PAYROLLTRNRS);
+  wrapper->SetTransUserID("5");
+  OEStatus* status = new OEStatus;
+  status->SetCode(int32_t{0});
+  status->SetSeverity(OE_SEVERITY_INFO);
+  wrapper->SetStatus(status);
+  ASSERT_EQ(update->AppendTrans(wrapper), 1);
+  OEPayrollUpdateData* data = new OEPayrollUpdateData;
+  data->AppendEmployeeDeleteID(OEString32("E-9"));
+  update->SetUpdateData(data);
+  EXPECT_EQ(update->AllRequiredPresent(), 1);
+
+  OEMessageSetRs set;
+  set.SetType(OE_TAG_V_PAYROLLMSGSRSV1);
+  ASSERT_EQ(set.AppendSync(update), 1);
+  EXPECT_EQ(Write(set), "<V.PAYROLLMSGSRSV1><V.PAYROLLUPDATERS><TOKEN>7<V.DDSTATUS><V.DDMODE>APPLIED</V.DDSTATUS>"
+                        "<V.PAYCHKNEXTID>PC-1<V.PAYROLLTXNEXTID>TX-1<V.EMPNEXTID>E-1<V.PITEMNEXTID>1"
+                        "<V.PAYROLLTRNRS><TRNUID>5<STATUS><CODE>0<SEVERITY>INFO</STATUS></V.PAYROLLTRNRS>"
+                        "<V.PAYROLLUPDATEDATA><V.EMPDELID>E-9</V.PAYROLLUPDATEDATA>"
+                        "</V.PAYROLLUPDATERS></V.PAYROLLMSGSRSV1>");
+  // The children are the statuses, the wrappers and the update data.
+  EXPECT_EQ(update->GetNumberOfChildren(), 3);
+  EXPECT_EQ(update->GetChild(0), dd);
+  EXPECT_EQ(update->GetChild(1), wrapper);
+  EXPECT_EQ(update->GetChild(2), data);
+}
+
 // ---------------------------------------------------------------------------
 
 TEST(PayrollFactory, CreatorsMakeTheirClassesWithTheirTags) {

@@ -217,6 +217,12 @@ TEST_F(PayrollAmountTest, DatesHaveAnEmptyState) {
   EXPECT_TRUE(Logged(OEPW_BADFORMAT));
   OEPayrollDateTime copy(a);
   EXPECT_TRUE(copy.IsEmpty());
+  // Against a plain date, an empty date is never equal.
+  OEDateTime plain(2024, 1, 15);
+  EXPECT_FALSE(copy == plain);
+  copy.SetEmpty(0);
+  copy.ConvertStringToOEDateTime("20240115");
+  EXPECT_TRUE(copy == plain);
 }
 
 TEST_F(PayrollAmountTest, PayrollBuilderWritesTheValuesOwnText) {

@@ -146,9 +146,12 @@ class OEPayrollDateTime : public OEDateTime {
   unsigned short GetDateString(OEString& out) const;
   unsigned short GetText(OEString& out) const override { return GetDateString(out); }
 
-  // Two empty dates are equal; an empty date equals no other.
+  // Two empty dates are equal; an empty date equals no other, and no plain
+  // date.
   unsigned short operator==(const OEPayrollDateTime& other) const;
   unsigned short operator!=(const OEPayrollDateTime& other) const { return !(*this == other); }
+  unsigned short operator==(const OEDateTime& other) const { return !m_empty && OEDateTime::operator==(other); }
+  unsigned short operator!=(const OEDateTime& other) const { return !(*this == other); }
 
  private:
   unsigned short m_empty = 0;
