@@ -51,6 +51,13 @@
 #include "ofxkit/extensions/OEVexaBrand.h"
 #include "ofxkit/extensions/OEVexaUsage.h"
 
+#include "ofxkit/payroll/OEPayrollTypes.h"
+#include "ofxkit/payroll/OEPayrollCompany.h"
+#include "ofxkit/payroll/OEPayrollEmployee.h"
+#include "ofxkit/payroll/OEPayrollCheck.h"
+#include "ofxkit/payroll/OEPayrollItem.h"
+#include "ofxkit/payroll/OEPayrollMessages.h"
+
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/parse/OEParser.h"
 #include "ofxkit/parse/OEParseEngine.h"

@@ -1,5 +1,7 @@
 #include "ofxkit/envelope/OEMessageSet.h"
 
+#include "ofxkit/payroll/OEPayrollMessages.h"
+
 #include <algorithm>
 #include <new>
 #include <type_traits>
@@ -100,12 +102,8 @@ const OETagID kExtensionOrder[2][8] = {
 
 int SetRowOf(OETagID tag, Side side) { return OEFindRow(kSets, &SetRow::set, tag, side); }
 
-// The payroll update response. Its own class (with the payroll fields) is
-// made here once it exists; until then a generic sync response reads its
-// token and wrappers.
-OEDataObj* NewPayrollUpdate(OEDataObjFactory* factory, OETagID) {
-  return OEChildCreator<OESyncRs>::Make(factory, OE_TAG_NONE);
-}
+// The payroll update response has its own class, with the payroll fields.
+OEDataObj* NewPayrollUpdate(OEDataObjFactory* factory, OETagID) { return factory->NewPayrollUpdateRs(); }
 
 template <class SyncClass>
 OETypeDescription DescribeSet(const SetRow& row, Side side) {
