@@ -120,14 +120,15 @@ std::string DefaultReplyPath(const std::string& request) {
   return base + "-reply.ofx";
 }
 
-// Adds the certificate in a file (DER, or PEM's base64) as a trusted root.
-bool TrustRoot(GXNNetRequest& request, const std::string& spec, std::string* error) {
-  std::string path = spec;
+// Adds the certificate in a file (DER, or PEM's base64) as a trusted root;
+// the option is PATH or PATH:SLOT (slot 1 to 4).
+bool TrustRoot(GXNNetRequest& request, const std::string& option, std::string* error) {
+  std::string path = option;
   long id = OE_ROOT_VEXA_BRANDING;
-  size_t colon = spec.rfind(':');
-  if (colon != std::string::npos && colon + 2 == spec.size() && spec[colon + 1] >= '1' && spec[colon + 1] <= '4') {
-    path = spec.substr(0, colon);
-    id = spec[colon + 1] - '0';
+  size_t colon = option.rfind(':');
+  if (colon != std::string::npos && colon + 2 == option.size() && option[colon + 1] >= '1' && option[colon + 1] <= '4') {
+    path = option.substr(0, colon);
+    id = option[colon + 1] - '0';
   }
   OEBuffer file;
   if (!ReadFile(path, file, error)) return false;
@@ -214,8 +215,8 @@ int CmdExchange(int argc, char** argv) {
   }
   std::unique_ptr<GXNNetRequest> request(static_cast<GXNNetRequest*>(access.NewNetRequest()));
   if (!request) return kTransferFailed;
-  for (const std::string& spec : trusted) {
-    if (!TrustRoot(*request, spec, &error)) {
+  for (const std::string& option : trusted) {
+    if (!TrustRoot(*request, option, &error)) {
       std::fprintf(stderr, "ofxkit exchange: %s\n", error.c_str());
       return kBadInput;
     }
