@@ -69,6 +69,16 @@ check "payment answered: processing status, server id, payee kept" "1 1 1" \
 echo "s3cret" | $ofxkit request payment "${signon[@]}" --bank-id 121000248 --account 1001 --amount 1 \
   --payee-id 77 --payee-name X --pay-account 1 > /dev/null 2>&1
 check "a payee both by id and by name is refused" 64 $?
+# Requests declare CHARSET:1252: a payee's name and memo given as UTF-8 are
+# written in Windows-1252, and a character that set lacks is refused.
+echo "s3cret" | $ofxkit request payment "${signon[@]}" --bank-id 121000248 --account 1001 --amount 12 \
+  --payee-name "Café Müller" --payee-addr1 "1 Grid Rd" --payee-city Springfield --payee-state IL \
+  --payee-postal 62701 --payee-phone 555-0142 --pay-account 55-1234 --memo "Crème" -o "$work/cafe-rq.ofx" 2> /dev/null
+check "a payee's name and memo written in Windows-1252" "1 1" \
+  "$(grep -c "^<NAME>Caf$(printf '\xe9') M$(printf '\xfc')ller" "$work/cafe-rq.ofx") $(grep -c "^<MEMO>Cr$(printf '\xe8')me" "$work/cafe-rq.ofx")"
+echo "s3cret" | $ofxkit request payment "${signon[@]}" --bank-id 121000248 --account 1001 --amount 12 \
+  --payee-id 77 --pay-account 1 --memo "Ω" > /dev/null 2> "$work/omega.err"
+check "a memo Windows-1252 cannot write is refused" "64 1" "$? $(grep -c 'memo is not UTF-8 text' "$work/omega.err")"
 
 echo "wrong" | $ofxkit request accounts --org Demo --user alice --password-stdin -o "$work/denied-rq.ofx" 2> /dev/null
 post denied

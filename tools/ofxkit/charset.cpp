@@ -166,4 +166,18 @@ std::string Utf8Converter::Report() const {
   return line;
 }
 
+bool ToWindows1252(const char* text, size_t n, std::string& out) {
+  out.clear();
+  iconv_t cd = iconv_open("CP1252", "UTF-8");
+  if (cd == reinterpret_cast<iconv_t>(-1)) return false;
+  out.assign(n, '\0');  // never longer than its UTF-8 form
+  char* in = const_cast<char*>(text);
+  char* to = &out[0];
+  size_t left = n, room = n;
+  bool ok = iconv(cd, &in, &left, &to, &room) != static_cast<size_t>(-1) && left == 0;
+  iconv_close(cd);
+  out.resize(ok ? n - room : 0);
+  return ok;
+}
+
 }  // namespace cli

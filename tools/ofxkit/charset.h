@@ -17,6 +17,12 @@ std::string CharsetName(const char* charset, const char* encoding);
 // The same, from the headers of a parsed file.
 std::string CharsetOf(const OEFileOFX& file);
 
+// The tool writes requests with CHARSET:1252, so texts given to it as UTF-8
+// (options, the body of a message) are written in Windows-1252. False, with
+// out empty, for text that is not UTF-8 or holds a character that
+// Windows-1252 lacks.
+bool ToWindows1252(const char* text, size_t n, std::string& out);
+
 // Converts text from one character set to UTF-8 with the C library's iconv.
 // A byte that does not convert (undefined in the character set, or not part
 // of a valid sequence) comes out as U+FFFD and is counted, so the caller can

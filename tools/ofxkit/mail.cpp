@@ -9,6 +9,7 @@
 #include <tuple>
 #include <type_traits>
 
+#include "charset.h"
 #include "cli.h"
 
 namespace cli {
@@ -17,22 +18,6 @@ namespace {
 bool Fail(const std::string& message) {
   std::fprintf(stderr, "ofxkit request: %s\n", message.c_str());
   return false;
-}
-
-// Request files declare CHARSET:1252, so the message's texts, given as
-// UTF-8, are written in Windows-1252. False (and nothing in out) for text that
-// is not UTF-8 or holds a character that Windows-1252 lacks.
-bool ToWindows1252(const char* text, size_t n, std::string& out) {
-  iconv_t cd = iconv_open("CP1252", "UTF-8");
-  if (cd == reinterpret_cast<iconv_t>(-1)) return false;
-  out.assign(n, '\0');  // never longer than its UTF-8 form
-  char* in = const_cast<char*>(text);
-  char* to = &out[0];
-  size_t left = n, room = n;
-  bool ok = iconv(cd, &in, &left, &to, &room) != static_cast<size_t>(-1) && left == 0;
-  iconv_close(cd);
-  out.resize(ok ? n - room : 0);
-  return ok;
 }
 
 // The body file's text without surrounding blank space (a reader drops it

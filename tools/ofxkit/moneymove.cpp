@@ -6,6 +6,7 @@
 #include <ctime>
 #include <string>
 
+#include "charset.h"
 #include "cli.h"
 
 namespace cli {
@@ -90,6 +91,17 @@ bool AppendTransfer(const StatementRequestOptions& o, OERequest& request) {
   return true;
 }
 
+// An option's text for the request (Windows-1252); false when it has a
+// character that cannot be written so.
+bool RequestText(const StatementRequestOptions& o, const char* option, std::string& out) {
+  const std::string given = Value(o, option);
+  return ToWindows1252(given.data(), given.size(), out);
+}
+
+std::string NotWindows1252(const char* option) {
+  return std::string("--") + option + " is not UTF-8 text, or holds characters that Windows-1252 lacks";
+}
+
 bool AppendPayment(const StatementRequestOptions& o, OERequest& request) {
   OEPaymentRq* payment = new OEPaymentRq();
   OEPaymentInfo* info = new OEPaymentInfo();
@@ -102,7 +114,8 @@ bool AppendPayment(const StatementRequestOptions& o, OERequest& request) {
   if (!from) return fail("no account to pay from");
   info->SetBankAcctFrom(from);
   if (!SetAmountAndDue(*info, o)) return fail("the payment was not written");
-  std::string payeeId = Value(o, "payee-id"), name = Value(o, "payee-name");
+  std::string payeeId = Value(o, "payee-id"), name, text;
+  if (!RequestText(o, "payee-name", name)) return fail(NotWindows1252("payee-name"));
   if (payeeId.empty() == name.empty()) return fail("name the payee by --payee-id or by --payee-name, not both");
   if (!payeeId.empty()) {
     info->SetPayeeID(payeeId.c_str());
@@ -115,14 +128,17 @@ bool AppendPayment(const StatementRequestOptions& o, OERequest& request) {
                                                      {"payee-state", OE_TAG_STATE},
                                                      {"payee-postal", OE_TAG_POSTALCODE},
                                                      {"payee-phone", OE_TAG_PHONE}};
-    for (const auto& [option, tag] : parts)
-      if (!Value(o, option).empty()) payee->SetElementText(tag, Value(o, option).c_str());
+    for (const auto& [option, tag] : parts) {
+      if (!RequestText(o, option, text)) return fail(NotWindows1252(option));
+      if (!text.empty()) payee->SetElementText(tag, text.c_str());
+    }
     if (!payee->AllRequiredPresent())
       return fail("a payee named by name needs --payee-addr1, --payee-city, --payee-state, --payee-postal and --payee-phone");
   }
   if (Value(o, "pay-account").empty()) return fail("--pay-account (your account number with the payee) is needed");
   info->SetPayAccount(Value(o, "pay-account").c_str());
-  if (!Value(o, "memo").empty()) info->SetMemo(Value(o, "memo").c_str());
+  if (!RequestText(o, "memo", text)) return fail(NotWindows1252("memo"));
+  if (!text.empty()) info->SetMemo(text.c_str());
   AppendWrapped(request, OE_TAG_BILLPAYMSGSRQV1, OE_TAG_PMTTRNRQ, OE_TAG_PMTRQ, payment);
   return true;
 }
