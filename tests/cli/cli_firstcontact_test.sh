@@ -35,7 +35,7 @@ signon=(--org Demo --fid 1 --user alice --password-stdin)
 echo "s3cret" | $ofxkit request profile "${signon[@]}" -o "$work/profile-rq.ofx" 2> /dev/null
 post profile; check "profile exchanged" 0 $?
 $ofxkit profile "$work/profile-rs.ofx" > "$work/profile.txt"; check "profile read" 0 $?
-check "every served message set listed" 7 "$(grep -c 'MSGSETV1 *version 1' "$work/profile.txt")"
+check "every served message set listed" 8 "$(grep -c 'MSGSETV1 *version 1' "$work/profile.txt")"
 check "the realm's rules" 1 "$(grep -c 'DEMO: password of 6 to 32 characters' "$work/profile.txt")"
 echo "s3cret" | $ofxkit request accounts "${signon[@]}" -o "$work/accounts-rq.ofx" 2> /dev/null
 post accounts; check "accounts exchanged" 0 $?

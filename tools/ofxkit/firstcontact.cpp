@@ -179,7 +179,7 @@ OEProfileRs* ServedProfile() {
   signUp->SetActivationRequest(0);
   OEBankMessageSetV1* bank = AddVersion<OEBankMessageSetV1>(*list, OE_TAG_BANKMSGSET);
   OEEMailProfile* mail = new OEEMailProfile();
-  mail->SetCanEMail(0);
+  mail->SetCanEMail(1);  // secure mail about an account is answered
   mail->SetCanNotify(0);
   bank->SetEMailProfile(mail);
   bank->SetClosingAvailable(0);
@@ -187,8 +187,12 @@ OEProfileRs* ServedProfile() {
   OEInvStmtMsgSetV1* invest = AddVersion<OEInvStmtMsgSetV1>(*list, OE_TAG_INVSTMTMSGSET);
   for (OETagID flag : {OE_TAG_TRANDNLD, OE_TAG_OODNLD, OE_TAG_POSDNLD, OE_TAG_BALDNLD})
     invest->SetElementText(flag, OEString("Y"));
-  invest->SetCanEMail(static_cast<unsigned short>(0));
+  invest->SetCanEMail(static_cast<unsigned short>(1));
   AddVersion<OESecListMsgSetV1>(*list, OE_TAG_SECLISTMSGSET)->SetSecListRqDnld(static_cast<unsigned short>(1));
+  // Free-form secure mail is answered; MIME attachments are not offered.
+  OEEMailMessageSetV1* email = AddVersion<OEEMailMessageSetV1>(*list, OE_TAG_EMAILMSGSET);
+  email->SetEMailSup(1);
+  email->SetGetMimeSup(0);
   AddVersion<OEProfileMessageSetV1>(*list, OE_TAG_PROFMSGSET);
   rs->SetMessageSetList(list);
 
