@@ -226,7 +226,7 @@ void Warn(OEParseWarning warning, const char* text) {
 // Construction and assignment
 
 OEPrecisionInteger::OEPrecisionInteger()
-    : m_word{0, 0, 0}, m_sign(1), m_decimal(0), m_text(nullptr), m_binary(nullptr) {}
+    : m_word{0, 0, 0}, m_sign(1), m_decimal(0), m_blocks(nullptr) {}
 
 OEPrecisionInteger::OEPrecisionInteger(int32_t value, unsigned short decimal) : OEPrecisionInteger() {
   *this = value;
@@ -241,14 +241,11 @@ OEPrecisionInteger::OEPrecisionInteger(const OEPrecisionInteger& other)
     : m_word{other.m_word[0], other.m_word[1], other.m_word[2]},
       m_sign(other.m_sign),
       m_decimal(other.m_decimal),
-      m_text(nullptr),
-      m_binary(nullptr) {}
+      m_blocks(nullptr) {}
 
 void OEPrecisionInteger::FreeBlocks() {
-  delete[] m_text;
-  delete[] m_binary;
-  m_text = nullptr;
-  m_binary = nullptr;
+  delete[] m_blocks;
+  m_blocks = nullptr;
 }
 
 OEPrecisionInteger& OEPrecisionInteger::operator=(const char* text) {
@@ -364,16 +361,21 @@ unsigned short OEPrecisionInteger::FormatText(char* out) const {
   return static_cast<unsigned short>(o - out);
 }
 
-OEPrecisionInteger::operator char*() {
-  if (m_text == nullptr) {
-    m_text = new (std::nothrow) char[kTextSize];
-    if (m_text == nullptr) {
-      g_allocFailed = 1;
-      return nullptr;
-    }
+// The text block (kTextSize bytes) followed by the binary block
+// (m_binaryLen bytes), made together on the first use of either; null with
+// g_allocFailed set when it cannot be had.
+char* OEPrecisionInteger::Blocks() {
+  if (m_blocks == nullptr) {
+    m_blocks = new (std::nothrow) char[kTextSize + m_binaryLen];
+    if (m_blocks == nullptr) g_allocFailed = 1;
   }
-  FormatText(m_text);
-  return m_text;
+  return m_blocks;
+}
+
+OEPrecisionInteger::operator char*() {
+  char* text = Blocks();
+  if (text) FormatText(text);
+  return text;
 }
 
 // ---------------------------------------------------------------------------
@@ -594,17 +596,13 @@ uint32_t OEPrecisionInteger::GetMSBytes() const { return m_word[2]; }
 // Binary record
 
 char* OEPrecisionInteger::LockBuffer() {
-  if (m_binary == nullptr) {
-    m_binary = new (std::nothrow) char[m_binaryLen];
-    if (m_binary == nullptr) g_allocFailed = 1;
-  }
-  return m_binary;
+  char* blocks = Blocks();
+  return blocks ? blocks + kTextSize : nullptr;
 }
 
-void OEPrecisionInteger::UnLockBuffer() {
-  delete[] m_binary;
-  m_binary = nullptr;
-}
+// The block shares its allocation with the text of operator char*, which
+// may still be in use: both are released with the value.
+void OEPrecisionInteger::UnLockBuffer() {}
 
 namespace {
 // Offsets of the fields in the binary record.

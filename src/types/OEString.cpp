@@ -14,7 +14,7 @@ constexpr size_t kMaxBlock = 0xFFFF;  // a block holds at most 65535 bytes
 }
 
 OEString::OEString()
-    : m_encoding(OE_ENCODE_PLAIN), m_specLength(kNoLimit), m_bufferSize(0), m_length(0), m_store() {}
+    : m_encoding(static_cast<uint8_t>(OE_ENCODE_PLAIN)), m_specLength(kNoLimit), m_bufferSize(0), m_length(0), m_store() {}
 
 OEString::OEString(const char* text) : OEString() {
   if (text) Assign(text, strlen(text));

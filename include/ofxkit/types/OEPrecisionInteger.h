@@ -26,7 +26,7 @@ class OEPrecisionInteger {
   // Inline: amounts are destroyed by the million, and most never made either
   // block.
   virtual ~OEPrecisionInteger() {
-    if (m_text || m_binary) FreeBlocks();
+    if (m_blocks) FreeBlocks();
   }
 
   virtual OEPrecisionInteger& operator=(const char* text);
@@ -122,8 +122,9 @@ class OEPrecisionInteger {
 
   // Binary record, little-endian: version 1 (2 bytes), low, middle and high
   // words (4 bytes each), sign (+1 or 0xFFFF), decimal (2 bytes).
-  // A m_binaryLen-byte block owned by the object, allocated once; null with
-  // g_allocFailed set when it cannot be had.
+  // A m_binaryLen-byte block owned by the object, allocated once (with the
+  // text block of operator char*) and released with the object; null with
+  // g_allocFailed set when it cannot be had. UnLockBuffer keeps it.
   char* LockBuffer();
   void UnLockBuffer();
   // Writes the record to dest and sets *len to m_binaryLen; nothing happens
@@ -134,6 +135,7 @@ class OEPrecisionInteger {
 
  private:
   void FreeBlocks();
+  char* Blocks();
   void SetZero();
   // Adds sign x magnitude x 10^-decimal of another value (sign given apart so
   // that subtraction can pass the flipped one).
@@ -144,8 +146,7 @@ class OEPrecisionInteger {
   uint32_t m_word[3];  // low, middle, high words of the magnitude
   short m_sign;        // +1 or -1
   unsigned short m_decimal;
-  char* m_text;    // text block of operator char*, made on first use
-  char* m_binary;  // block of LockBuffer
+  char* m_blocks;  // text block of operator char*, then that of LockBuffer; made on first use
 };
 
 // A rate between 0 and 100 inclusive.

@@ -54,8 +54,8 @@ class OEString {
   unsigned short IsEmpty() const { return m_length == 0; }
   unsigned short SpecLength() const { return m_specLength; }
   unsigned short ExceedsSpecLength() const { return m_specLength < m_length; }
-  OEStringEncode GetEncoding() const { return m_encoding; }
-  void SetEncoding(OEStringEncode e) { m_encoding = e; }
+  OEStringEncode GetEncoding() const { return static_cast<OEStringEncode>(m_encoding); }
+  void SetEncoding(OEStringEncode e) { m_encoding = static_cast<uint8_t>(e); }
 
   virtual void SetSpecLength(unsigned short specLength) { m_specLength = specLength; }
   virtual unsigned short IsValid() const;
@@ -86,7 +86,7 @@ class OEString {
 
  public:
   // Blocks of up to this many bytes are held inside the string.
-  static constexpr unsigned short kInlineBlock = 30;
+  static constexpr unsigned short kInlineBlock = 32;
 
  private:
   bool EnsureRoom(size_t n);
@@ -103,7 +103,7 @@ class OEString {
   const char* Block() const { return IsInline() ? m_store : HeapBlock(); }
   void TakeStorage(OEString& other);
 
-  OEStringEncode m_encoding;
+  uint8_t m_encoding;  // an OEStringEncode; one byte keeps the string at 48 bytes
   unsigned short m_specLength;
   unsigned short m_bufferSize;  // 0: null string; up to kInlineBlock: inline
   unsigned short m_length;
