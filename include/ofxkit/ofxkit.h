@@ -50,6 +50,7 @@
 #include "ofxkit/extensions/OEVexaDataConversion.h"
 #include "ofxkit/extensions/OEVexaBrand.h"
 #include "ofxkit/extensions/OEVexaUsage.h"
+#include "ofxkit/extensions/OEVexaArrays.h"
 
 #include "ofxkit/payroll/OEPayrollTypes.h"
 #include "ofxkit/payroll/OEPayrollCompany.h"
@@ -57,6 +58,7 @@
 #include "ofxkit/payroll/OEPayrollCheck.h"
 #include "ofxkit/payroll/OEPayrollItem.h"
 #include "ofxkit/payroll/OEPayrollMessages.h"
+#include "ofxkit/payroll/OEPayrollArrays.h"
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/parse/OEParser.h"

@@ -20,11 +20,14 @@ OE_DEFINE_AGGREGATE(OEDirectDepositAccount, OEAggregate, OE_DIRECTDEPOSITACCOUNT
 OE_DEFINE_AGGREGATE(OEEmployeeDirectDepositInfo, OEAggregate, OE_EMPLOYEEDDINFO_FIELDS, V_EMPDD,
                     .Valid(OE_TAGS(V_USEDD, V_DDACCT))
                     .Required(OE_TAGS(V_USEDD)))
-OE_DEFINE_AGGREGATE(OEEmployeeFit, OEAggregate, OE_EMPLOYEEFIT_FIELDS, V_EMPFIT,
+// Family bases: never used alone; each member's valid tags choose its fields.
+OE_DEFINE_AGGREGATE(OEEmployeeTaxBase, OEEnvelopeAggregate, OE_EMPLOYEETAXBASE_FIELDS, NONE, )
+OE_DEFINE_AGGREGATE(OEEmployeeStateTaxBase, OEEmployeeTaxBase, OE_EMPLOYEESTATETAXBASE_FIELDS, NONE, )
+OE_DEFINE_AGGREGATE(OEEmployeeFit, OEEmployeeTaxBase, OE_EMPLOYEEFIT_FIELDS, V_EMPFIT,
                     .Valid(OE_TAGS(V_FEDFILESTATUS, V_ALLOWANCES, V_EXTRAWITHHOLD, V_SUBJTOFIT, V_SUBJTOSS,
                                    V_SUBJTOMCARE, V_SUBJTOFUTA, V_QUALFORAEIC)))
 
-OE_DEFINE_AGGREGATE(OEEmployeeSit, OEEnvelopeAggregate, OE_EMPLOYEESIT_FIELDS, V_EMPSIT,
+OE_DEFINE_AGGREGATE(OEEmployeeSit, OEEmployeeStateTaxBase, OE_EMPLOYEESIT_FIELDS, V_EMPSIT,
                     .Valid(OE_TAGS(V_STATE, V_STATEFILESTATUS, V_ALLOWANCES, V_EXTRAWITHHOLD, V_TAXAFFECTED))
                     .Required(OE_TAGS(V_STATE)))
 const OEAggregateInfo* OEEmployeeSit::TypeInfo(OETagID type) {

@@ -257,6 +257,51 @@ TEST_F(PayrollAggregateTest, TagsChosenByTheTagAnObjectStandsUnder) {
   EXPECT_EQ(copy.GetTaxSummary(0)->GetReportingYtd()->GetType(), OE_TAG_V_EMPRPTYTD);
 }
 
+// Federal and state withholding share their allowances and extra withholding
+// through OEEmployeeTaxBase; every state tax has its state through
+// OEEmployeeStateTaxBase. A caller holding the base reaches what was read.
+TEST_F(PayrollAggregateTest, TaxFamiliesShareTheirFieldsThroughTheirBases) {
+  OEEmployee* emp = Parse(
+      "<V.EMP><V.EMPTAX><V.EMPFIT><V.FEDFILESTATUS>MARRIED<V.ALLOWANCES>3<V.EXTRAWITHHOLD>$25.00</V.EMPFIT>"
+      "<V.EMPSIT><V.STATE>IL<V.ALLOWANCES>2<V.EXTRAWITHHOLD>$5.00</V.EMPSIT>"
+      "<V.EMPSDI><V.STATE>CA<V.TAXAFFECTED>Y</V.EMPSDI></V.EMPTAX><V.EMPID>E-3</V.EMP>")
+                      ->GetEmployee();
+  ASSERT_NE(emp, nullptr);
+  OEEmployeeTaxInfo* tax = emp->GetTaxInfo();
+  ASSERT_NE(tax, nullptr);
+  std::vector<const OEEmployeeTaxBase*> withholding = {tax->GetFit(), tax->GetSit()};
+  ASSERT_NE(withholding[0], nullptr);
+  ASSERT_NE(withholding[1], nullptr);
+  EXPECT_EQ(withholding[0]->GetAllowances(), 3);
+  EXPECT_EQ(Text(withholding[0]->GetExtraWithholding()), "$25.00");
+  EXPECT_EQ(withholding[1]->GetAllowances(), 2);
+  const OEEmployeeStateTaxBase* sdi = tax->GetSdi();
+  ASSERT_NE(sdi, nullptr);
+  EXPECT_EQ(sdi->GetState(), "CA");
+  EXPECT_EQ(sdi->GetTaxAffected(), 1);
+  // The insurance takes no allowances even though its base declares them.
+  OEEmployeeSdi fresh;
+  EXPECT_EQ(fresh.SetAllowances(static_cast<unsigned short>(1)), 0);
+  EXPECT_EQ(fresh.SetState(OEString("NY")), 1);
+}
+
+// The named arrays own their elements and hand them back typed.
+TEST(PayrollArrays, NamedArraysOwnTypedElements) {
+  OEDynamicArrayEmployee employees;
+  OEEmployee* first = new OEEmployee;
+  first->SetEmployeeID(OEString("E-1"));
+  ASSERT_EQ(employees.Append(first), 1);
+  ASSERT_EQ(employees.Append(new OEEmployee), 1);
+  EXPECT_EQ(employees.Entries(), 2);
+  EXPECT_EQ(employees.Get(0)->GetEmployeeID(), "E-1");
+  OEEmployee* taken = employees.Get(1);
+  ASSERT_EQ(employees.UnSet(1), 1);  // ownership comes back to the caller
+  delete taken;
+  OEDynamicArrayVexaService services;
+  ASSERT_EQ(services.SetVal(0, static_cast<OEVexaService>(1)), 1);
+  EXPECT_EQ(*services.Get(0), static_cast<OEVexaService>(1));
+}
+
 TEST_F(PayrollAggregateTest, PayrollRunWithPaychecksLinesAndTaxLiabilities) {
   const std::string run = std::string("<V.PAYROLLRUN>") + kPayCheck + kPayCheck + kDisburse +
                           "<V.DTPAYCHKS>20240415</V.PAYROLLRUN>";

@@ -79,34 +79,49 @@ class OEEmployeeDirectDepositInfo : public OEAggregate {
   OE_AGGREGATE(OEEmployeeDirectDepositInfo, OE_EMPLOYEEDDINFO_FIELDS)
 };
 
+// What federal and state income tax withholding share: the allowances the
+// employee claims and the extra amount withheld each pay period.
+#define OE_EMPLOYEETAXBASE_FIELDS(X)                                    \
+  X(VALUE, Allowances, V_ALLOWANCES, unsigned short)                    \
+  X(VALUE, ExtraWithholding, V_EXTRAWITHHOLD, OEPayrollAmount)
+
+class OEEmployeeTaxBase : public OEEnvelopeAggregate {
+  OE_AGGREGATE(OEEmployeeTaxBase, OE_EMPLOYEETAXBASE_FIELDS)
+};
+
 // Withholding of the federal income tax and the federal taxes the employee
 // is subject to.
 #define OE_EMPLOYEEFIT_FIELDS(X)                                        \
   X(VALUE, FilingStatus, V_FEDFILESTATUS, OEFederalFilingStatus)        \
-  X(VALUE, Allowances, V_ALLOWANCES, unsigned short)                    \
-  X(VALUE, ExtraWithholding, V_EXTRAWITHHOLD, OEPayrollAmount)          \
   X(FLAG, SubjectToFIT, V_SUBJTOFIT, unsigned short)                    \
   X(FLAG, SubjectToSS, V_SUBJTOSS, unsigned short)                      \
   X(FLAG, SubjectToMedicare, V_SUBJTOMCARE, unsigned short)             \
   X(FLAG, SubjectToFUTA, V_SUBJTOFUTA, unsigned short)                  \
   X(FLAG, QualifiesForAEIC, V_QUALFORAEIC, unsigned short)
 
-class OEEmployeeFit : public OEAggregate {
+class OEEmployeeFit : public OEEmployeeTaxBase {
   OE_AGGREGATE(OEEmployeeFit, OE_EMPLOYEEFIT_FIELDS)
+};
+
+// What every state tax of the employee has: the state, and whether the
+// employee is subject to the tax.
+#define OE_EMPLOYEESTATETAXBASE_FIELDS(X)                               \
+  X(PTEXT, State, V_STATE, OEString5)                                   \
+  X(FLAG, TaxAffected, V_TAXAFFECTED, unsigned short)
+
+class OEEmployeeStateTaxBase : public OEEmployeeTaxBase {
+  OE_AGGREGATE(OEEmployeeStateTaxBase, OE_EMPLOYEESTATETAXBASE_FIELDS)
 };
 
 // A state tax of the employee: income tax withholding ("V.EMPSIT"),
 // disability insurance ("V.EMPSDI") or unemployment insurance ("V.EMPSUI").
-// The withholding has a filing status, allowances and extra withholding;
-// the insurances only the state and whether the employee is subject to it.
+// The withholding adds a filing status to the allowances and extra
+// withholding of its base; the insurances have only the state and whether
+// the employee is subject to it.
 #define OE_EMPLOYEESIT_FIELDS(X)                                        \
-  X(PTEXT, State, V_STATE, OEString5)                                   \
-  X(PTEXT, FilingStatus, V_STATEFILESTATUS, OEString32)                 \
-  X(VALUE, Allowances, V_ALLOWANCES, unsigned short)                    \
-  X(VALUE, ExtraWithholding, V_EXTRAWITHHOLD, OEPayrollAmount)          \
-  X(FLAG, TaxAffected, V_TAXAFFECTED, unsigned short)
+  X(PTEXT, FilingStatus, V_STATEFILESTATUS, OEString32)
 
-class OEEmployeeSit : public OEEnvelopeAggregate {
+class OEEmployeeSit : public OEEmployeeStateTaxBase {
   OE_AGGREGATE_BY_TYPE(OEEmployeeSit, OE_EMPLOYEESIT_FIELDS)
 };
 OE_PAYROLL_TYPED_SUBCLASS(OEEmployeeSdi, OEEmployeeSit, V_EMPSDI)

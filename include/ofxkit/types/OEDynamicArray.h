@@ -181,6 +181,14 @@ OE_STRING_ARRAY(64)
 OE_STRING_ARRAY(255)
 #undef OE_STRING_ARRAY
 
+// A named array of owned elements of one class, for applications that keep
+// lists of them: OE_TYPED_ARRAY(Wage, OEWage) is OEDynamicArrayWage.
+#define OE_TYPED_ARRAY(Name, Element)                                    \
+  class OEDynamicArray##Name : public OEDynamicArrayTyped<Element> {     \
+   public:                                                               \
+    using OEDynamicArrayTyped<Element>::OEDynamicArrayTyped;             \
+  };
+
 class OEDynamicArrayOEUShort : public OEDynamicArrayTyped<unsigned short> {
  public:
   using OEDynamicArrayTyped<unsigned short>::OEDynamicArrayTyped;

@@ -167,17 +167,35 @@ OE_RECTRANSFERCANCEL_CLASS(OERecInterCancelRs)
 #define OE_RECINTERMODIFYRQ_FIELDS(X) OE_RECINTERRQ_FIELDS(X) OE_RECSRVRTID_FIELD(X) OE_MODPENDING_FIELD(X)
 #define OE_RECINTERMODIFYRS_FIELDS(X) OE_RECINTERRS_FIELDS(X) OE_MODPENDING_FIELD(X)
 
-#define OE_RECTRANSFER_CLASS(Class, FIELDS)          \
-  class Class : public OETransBase {                 \
-    OE_AGGREGATE(Class, FIELDS)                      \
-    using OETransBase::DeepCopyFrom;                 \
-  };
-OE_RECTRANSFER_CLASS(OERecIntraRq, OE_RECINTRARQ_FIELDS)
-OE_RECTRANSFER_CLASS(OERecIntraRs, OE_RECINTRARS_FIELDS)
-OE_RECTRANSFER_CLASS(OERecIntraModifyRq, OE_RECINTRAMODIFYRQ_FIELDS)
-OE_RECTRANSFER_CLASS(OERecIntraModifyRs, OE_RECINTRAMODIFYRS_FIELDS)
-OE_RECTRANSFER_CLASS(OERecInterRq, OE_RECINTERRQ_FIELDS)
-OE_RECTRANSFER_CLASS(OERecInterRs, OE_RECINTERRS_FIELDS)
-OE_RECTRANSFER_CLASS(OERecInterModifyRq, OE_RECINTERMODIFYRQ_FIELDS)
-OE_RECTRANSFER_CLASS(OERecInterModifyRs, OE_RECINTERMODIFYRS_FIELDS)
-#undef OE_RECTRANSFER_CLASS
+class OERecIntraRq : public OETransBase {
+  OE_AGGREGATE(OERecIntraRq, OE_RECINTRARQ_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecIntraRs : public OETransBase {
+  OE_AGGREGATE(OERecIntraRs, OE_RECINTRARS_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecIntraModifyRq : public OETransBase {
+  OE_AGGREGATE(OERecIntraModifyRq, OE_RECINTRAMODIFYRQ_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecIntraModifyRs : public OETransBase {
+  OE_AGGREGATE(OERecIntraModifyRs, OE_RECINTRAMODIFYRS_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecInterRq : public OETransBase {
+  OE_AGGREGATE(OERecInterRq, OE_RECINTERRQ_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecInterRs : public OETransBase {
+  OE_AGGREGATE(OERecInterRs, OE_RECINTERRS_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecInterModifyRq : public OETransBase {
+  OE_AGGREGATE(OERecInterModifyRq, OE_RECINTERMODIFYRQ_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
+class OERecInterModifyRs : public OETransBase {
+  OE_AGGREGATE(OERecInterModifyRs, OE_RECINTERMODIFYRS_FIELDS)
+  using OETransBase::DeepCopyFrom;
+};
