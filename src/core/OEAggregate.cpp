@@ -1,15 +1,22 @@
 #include "ofxkit/core/OEAggregate.h"
 
 #include <algorithm>
+#include <cstdlib>
 #include <cstdio>
 #include <cstring>
 
 #include "ofxkit/parse/OEParseLogger.h"
+#include "OEPool.h"
 
 namespace {
 // Entries a dynamic array can hold: its count is 16-bit.
 constexpr unsigned kMaxListEntries = 0xFFFF;
 }  // namespace
+
+// Field store blocks: the least made (a first block until the class has
+// learnt better, and any further one), and the largest (the pool's).
+constexpr uint32_t kBlock = 64;
+constexpr uint32_t kLargestBlock = 4096;
 
 // ---------------------------------------------------------------------------
 
@@ -149,6 +156,16 @@ const OEAggregateInfo& OEAggregateInfo::Finish() {
   for (const OEAggregateInfo* info = this; info; info = info->parent)
     for (const OEFieldDesc& d : info->fields)
       if (!d.alias && !Contains(members, &d)) members.push_back(&d);
+  // Members are stored under the keys of their names: two members of one
+  // class under one key would share a value. That is a fault of the class's
+  // description, found the first time the class is used.
+  for (size_t i = 0; i < members.size(); ++i)
+    for (size_t j = i + 1; j < members.size(); ++j)
+      if (members[i]->key == members[j]->key) {
+        fprintf(stderr, "ofxkit: members %s and %s of one aggregate share a key\n",
+                static_cast<const char*>(members[i]->member), static_cast<const char*>(members[j]->member));
+        abort();
+      }
   return *this;
 }
 
@@ -200,6 +217,15 @@ OEParseStatus OEAggregate::HandleTagElement(const OETagDictionaryEntry* const en
 unsigned short OEAggregate::SetElementText(OETagID tag, const OEString& text) {
   const OEFieldDesc* d = FieldAt(tag);
   return (d && d->setText) ? d->setText(this, tag, text) : 0;
+}
+
+OEParseStatus OEAggregate::HandleTagEnd(const OETagDictionaryEntry* const entry) {
+  OEParseStatus status = OEDataObj::HandleTagEnd(entry);
+  if (status == OE_PARSE_OK && !m_fields.Empty()) {
+    uint32_t used = std::min<uint32_t>((m_fields.UsedBytes() + 15u) & ~15u, kLargestBlock);
+    GetInfo().storeHint.bytes.store(static_cast<uint16_t>(used), std::memory_order_relaxed);
+  }
+  return status;
 }
 
 OEParseStatus OEAggregate::HandleTagStart(const OETagDictionaryEntry* const entry) {
@@ -377,9 +403,54 @@ void OEAggregate::ClearTagQuietly(OETagID tag) {
   if (position >= 0) ClearPresenceBit(position);
 }
 
-void OEAggregate::DestroyOwnFields(const OEAggregateInfo& info) {
-  for (const OEFieldDesc& d : info.fields)
-    if (d.reset && !d.alias) d.reset(this);
+void OEAggregate::DestroyFields(const OEAggregateInfo& info) {
+  if (m_fields.Empty()) return;
+  m_fields.ForEach([&info](uint32_t key, void* value) {
+    if (const OEFieldDesc* d = info.MemberByKey(key))
+      if (d->destroy) d->destroy(value);
+  });
+  m_fields.Release();
+}
+
+// ---------------------------------------------------------------------------
+
+void* OEFieldStore::Add(uint32_t key, uint32_t size, const OEStoreHint& hint) {
+  if (void* place = TryAdd(key, size)) return place;
+  size = (size + 7u) & ~7u;
+  const uint32_t needed = static_cast<uint32_t>(sizeof(Block) + sizeof(Entry)) + size;
+  uint32_t bytes = std::max<uint32_t>(needed, kBlock);
+  if (!m_first) bytes = std::max<uint32_t>(bytes, hint.bytes.load(std::memory_order_relaxed));
+  bytes = (bytes + 15u) & ~15u;
+  if (bytes > kLargestBlock) return nullptr;  // no value is this large
+  Block* block = static_cast<Block*>(OEPoolTake(bytes));
+  if (!block) return nullptr;
+  block->next = nullptr;
+  block->bytes = static_cast<uint16_t>(bytes);
+  block->count = 0;
+  block->valuesStart = static_cast<uint16_t>(bytes);
+  block->unused = 0;
+  if (m_last)
+    m_last->next = block;
+  else
+    m_first = block;
+  m_last = block;
+  return TryAdd(key, size);
+}
+
+uint32_t OEFieldStore::UsedBytes() const {
+  uint32_t used = 0;
+  for (const Block* b = m_first; b; b = b->next)
+    used += static_cast<uint32_t>(sizeof(Block) + b->count * sizeof(Entry) + (b->bytes - b->valuesStart));
+  return used;
+}
+
+void OEFieldStore::Release() {
+  for (Block* b = m_first; b;) {
+    Block* next = b->next;
+    OEPoolGive(b, b->bytes);
+    b = next;
+  }
+  m_first = m_last = nullptr;
 }
 
 unsigned short OESetTextField(OEAggregate* self, OEString& field, OETagID tag, const OEString& text) {

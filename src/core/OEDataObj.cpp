@@ -1,5 +1,7 @@
 #include "ofxkit/core/OEDataObj.h"
 
+#include "OEPool.h"
+
 #include <dlfcn.h>
 #include <sys/mman.h>
 
@@ -412,6 +414,9 @@ void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept 
 
 void OEDataObj::operator delete(void* p, std::size_t size) noexcept { GiveBack(p, size); }
 
+void* OEPoolTake(std::size_t size) noexcept { return TakeObject(size); }
+void OEPoolGive(void* p, std::size_t size) noexcept { GiveBack(p, size); }
+
 void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept {
   // Only a constructor that threw comes here: the object is not counted as
   // freed (its size is not known), only its memory is not reused.
@@ -423,5 +428,8 @@ void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept 
   return ::operator new(size, std::nothrow);
 }
 void OEDataObj::operator delete(void* p, std::size_t) noexcept { ::operator delete(p); }
+
+void* OEPoolTake(std::size_t size) noexcept { return ::operator new(size, std::nothrow); }
+void OEPoolGive(void* p, std::size_t) noexcept { ::operator delete(p); }
 void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept { ::operator delete(p); }
 #endif

@@ -64,6 +64,6 @@ OETagID OESignOnRq::GetFirstMissingRequiredTag(OETagID after) const {
 }
 
 OEDataObj* OESignOnRs::GetChild(unsigned short index) const {
-  if (index == 0) return m_Status;
-  return index == 1 ? m_FI : nullptr;
+  if (index == 0) return GetStatus();
+  return index == 1 ? GetFI() : nullptr;
 }

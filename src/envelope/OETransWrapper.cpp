@@ -243,19 +243,19 @@ OETagID OETransRq::MsgIDToTranWrapper(OETagID inner) {
 }
 
 unsigned short OETransRq::AllRequiredPresent() {
-  if (!m_ActualTrans || !ValidateTag(OE_TAG_TRNUID)) return 0;
+  if (!GetActualTrans() || !ValidateTag(OE_TAG_TRNUID)) return 0;
   int row = WrapperRowOf(GetType(), kRq);
   if (row < 0 || (kWrappers[row].rules & kRqInnerOptional)) return 1;
   // Exactly one of the alternatives (or the one inner tag).
   return CountPresent(*this, kWrappers[row].inner[kRq]) % 2;
 }
 
-bool OETransRs::IsErrorStatus() const { return ValidateTag(OE_TAG_STATUS) && m_Status && m_Status->IsError(); }
+bool OETransRs::IsErrorStatus() const { return ValidateTag(OE_TAG_STATUS) && GetStatus() && GetStatus()->IsError(); }
 
-bool OETransRs::IsUpToDate() const { return ValidateTag(OE_TAG_STATUS) && m_Status && m_Status->IsUpToDate(); }
+bool OETransRs::IsUpToDate() const { return ValidateTag(OE_TAG_STATUS) && GetStatus() && GetStatus()->IsUpToDate(); }
 
 unsigned short OETransRs::AllRequiredPresent() {
-  if (!m_Status || !ValidateTag(OE_TAG_TRNUID)) return 0;
+  if (!GetStatus() || !ValidateTag(OE_TAG_TRNUID)) return 0;
   int index = WrapperRowOf(GetType(), kRs);
   if (index < 0) return 1;
   const WrapperRow& row = kWrappers[index];
@@ -267,14 +267,14 @@ unsigned short OETransRs::AllRequiredPresent() {
 }
 
 OEDataObj* OETransRs::GetChild(unsigned short index) const {
-  if (m_ActualTrans) {
-    if (index == 0) return m_ActualTrans;
+  if (GetActualTrans()) {
+    if (index == 0) return GetActualTrans();
     --index;
   }
-  return index == 0 ? m_Status : nullptr;
+  return index == 0 ? GetStatus() : nullptr;
 }
 
-unsigned short OETransRs::GetNumberOfChildren() const { return (m_ActualTrans ? 1 : 0) + (m_Status ? 1 : 0); }
+unsigned short OETransRs::GetNumberOfChildren() const { return (GetActualTrans() ? 1 : 0) + (GetStatus() ? 1 : 0); }
 
 // ---------------------------------------------------------------------------
 

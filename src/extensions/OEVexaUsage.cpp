@@ -61,6 +61,6 @@ OE_DEFINE_AGGREGATE(OEVexaSurveyRq, OETransBase, OE_VEXASURVEYRQ_FIELDS, VEXA_SU
 
 OEString OEVexaCustInfo::GetVexaCustType() const {
   OEString text;
-  if (ValidateTag(OE_TAG_VEXA_CUSTTYPE)) OEValueTraits<OEVexaCustType>::ToText(m_VexaCustTypeEnum, text);
+  if (ValidateTag(OE_TAG_VEXA_CUSTTYPE)) OEValueTraits<OEVexaCustType>::ToText(GetVexaCustTypeEnum(), text);
   return text;
 }

@@ -21,7 +21,7 @@ OE_DEFINE_AGGREGATE(OEPayrollEnrollRs, OETransBase, OE_PAYROLLENROLLRS_FIELDS, V
 // sync's TOKEN and wrappers (the wrapper list taking "V.PAYROLLTRNRS") among
 // the payroll fields.
 OEPayrollUpdateRs::OEPayrollUpdateRs() { SetType(OE_TAG_V_PAYROLLUPDATERS); }
-OEPayrollUpdateRs::~OEPayrollUpdateRs() { DestroyOwnFields(ClassInfo()); }
+OEPayrollUpdateRs::~OEPayrollUpdateRs() { DestroyFields(ClassInfo()); }
 
 namespace {
 // The sync response's wrapper list under the payroll wrapper tag.

@@ -45,13 +45,20 @@
 // another. A class may inherit fields from
 // a family base; its valid tags choose which of them it uses.
 //
+// Fields are kept only once set: an aggregate holds a small store of the
+// fields it was given (see OEFieldStore), and a getter of a field never set
+// answers the type's default value. A field, once made, stays where it is
+// until the aggregate goes, so a reference a getter returned stays good.
+//
 // From that, OEAggregate supplies parsing (HandleTagElement, HandleTagStart),
 // writing (Build), deep copies, child enumeration, the required checks and the
 // destruction of owned children. Classes that depart from the pattern
 // override those virtual operations by hand.
 #pragma once
 
+#include <atomic>
 #include <cstdint>
+#include <new>
 #include <initializer_list>
 #include <type_traits>
 #include <vector>
@@ -225,6 +232,101 @@ struct OEFieldDesc {
   // Children that keep a link to the aggregate they stand for (see
   // OEOwnedAggregate): links a child just made by `maker`; null for others.
   void (*link)(OEDataObj* child, OEAggregate* maker, OETagID makerType);
+  // The key the member is stored under (OEFieldKey of its name), and what
+  // ends its stored value (deleting an owned child).
+  uint32_t key = 0;
+  void (*destroy)(void* value) = nullptr;
+};
+
+// The key of a member's name: FNV-1a, made at compile time.
+constexpr uint32_t OEFieldKey(const char* name) {
+  uint32_t hash = 2166136261u;
+  for (; *name; ++name) hash = (hash ^ static_cast<unsigned char>(*name)) * 16777619u;
+  return hash;
+}
+#define OE_FIELD_KEY(Name) (std::integral_constant<uint32_t, OEFieldKey(#Name)>::value)
+
+// How large the first block of a class's field stores is made: what the
+// last object of the class read by a parser needed. Objects of one list are
+// mostly alike, so most keep their fields in one block that fits them; one
+// with a rare further field takes a small block more.
+struct OEStoreHint {
+  OEStoreHint() = default;
+  OEStoreHint(const OEStoreHint& other) : bytes(other.bytes.load(std::memory_order_relaxed)) {}
+  OEStoreHint& operator=(const OEStoreHint& other) {
+    bytes.store(other.bytes.load(std::memory_order_relaxed), std::memory_order_relaxed);
+    return *this;
+  }
+  mutable std::atomic<uint16_t> bytes{0};
+};
+
+// The fields an aggregate was given. Each value lives in a block of the
+// store, under its key, from when it is made until the store is released;
+// blocks are chained, never moved. A block is its header, then its entries
+// (key and offset) growing up, then the values growing down from its end.
+class OEFieldStore {
+ public:
+  OEFieldStore() = default;
+  OEFieldStore(const OEFieldStore&) = delete;
+  OEFieldStore& operator=(const OEFieldStore&) = delete;
+  ~OEFieldStore() { Release(); }
+
+  // The value stored under key, or null.
+  void* Find(uint32_t key) const {
+    for (const Block* b = m_first; b; b = b->next) {
+      const Entry* e = b->Entries();
+      for (uint16_t i = 0; i < b->count; ++i)
+        if (e[i].key == key) return const_cast<char*>(reinterpret_cast<const char*>(b)) + e[i].offset;
+    }
+    return nullptr;
+  }
+  // Room for a new value of size bytes (at most 8-aligned) under key, in the
+  // last block when it fits; null when none is left. The caller constructs
+  // the value there.
+  void* TryAdd(uint32_t key, uint32_t size) {
+    Block* b = m_last;
+    if (!b) return nullptr;
+    size = (size + 7u) & ~7u;
+    uint32_t entriesEnd = static_cast<uint32_t>(sizeof(Block) + (b->count + 1u) * sizeof(Entry));
+    if (b->valuesStart < entriesEnd + size) return nullptr;
+    b->valuesStart = static_cast<uint16_t>(b->valuesStart - size);
+    b->Entries()[b->count++] = Entry{key, b->valuesStart, 0};
+    return reinterpret_cast<char*>(b) + b->valuesStart;
+  }
+  // As TryAdd, with a new block when the last one is full; the hint tells
+  // the size of a first block.
+  void* Add(uint32_t key, uint32_t size, const OEStoreHint& hint);
+  bool Empty() const { return m_first == nullptr; }
+  // Bytes of the blocks in use (headers, entries and values).
+  uint32_t UsedBytes() const;
+  // Calls f(key, value) for every value, in the order they were made.
+  template <class F>
+  void ForEach(F&& f) {
+    for (Block* b = m_first; b; b = b->next) {
+      Entry* e = b->Entries();
+      for (uint16_t i = 0; i < b->count; ++i) f(e[i].key, reinterpret_cast<char*>(b) + e[i].offset);
+    }
+  }
+  // Gives the blocks back. The values must have been ended before.
+  void Release();
+
+ private:
+  struct Entry {
+    uint32_t key;
+    uint16_t offset;
+    uint16_t unused;
+  };
+  struct Block {
+    Block* next;
+    uint16_t bytes;
+    uint16_t count;
+    uint16_t valuesStart;
+    uint16_t unused;
+    Entry* Entries() { return reinterpret_cast<Entry*>(this + 1); }
+    const Entry* Entries() const { return reinterpret_cast<const Entry*>(this + 1); }
+  };
+  Block* m_first = nullptr;
+  Block* m_last = nullptr;
 };
 
 // Everything the generic code knows of one class.
@@ -277,6 +379,15 @@ class OEAggregateInfo {
   // the valid tags lie too far apart for a table.
   OETagID firstTag = OE_TAG_NONE;
   std::vector<uint8_t> positionOf;
+  // The size the field stores of this class's objects start with.
+  OEStoreHint storeHint;
+
+  // The member (of the class chain) stored under key, or null.
+  const OEFieldDesc* MemberByKey(uint32_t key) const {
+    for (const OEFieldDesc* d : members)
+      if (d->key == key) return d;
+    return nullptr;
+  }
 
  private:
   const OEFieldDesc* FindField(OETagID tag) const;
@@ -297,6 +408,9 @@ class OEAggregate : public OEDataObj {
   OEParseStatus HandleTagStart(const OETagDictionaryEntry* const entry) override;
   using OEDataObj::HandleTagElement;
   OEParseStatus HandleTagElement(const OETagDictionaryEntry* const entry, const OEString& value) override;
+  // At its own end tag, an aggregate tells its class how large a field
+  // store it needed (OEStoreHint).
+  OEParseStatus HandleTagEnd(const OETagDictionaryEntry* const entry) override;
   unsigned short GetArrayOfValidTags(OEArrayOfTags& tags) const override;
   int32_t ValidTagPosition(OETagID tag) const override;
   unsigned short GetArrayOfRequiredTags(OEArrayOfTags& tags) const override;
@@ -322,10 +436,23 @@ class OEAggregate : public OEDataObj {
   // The field that takes the tag in this class, or null.
   const OEFieldDesc* FieldAt(OETagID tag) const;
 
- protected:
-  // Deletes the children held by the fields this class declares itself.
-  void DestroyOwnFields(const OEAggregateInfo& info);
+  // The stored value of the member with key, or null when it was never set.
+  void* FindFieldValue(uint32_t key) const { return m_fields.Find(key); }
+  // Room for a new value of the member with key (see OEFieldStore), or null
+  // when memory is exhausted.
+  void* MakeFieldValue(uint32_t key, uint32_t size) {
+    if (void* place = m_fields.TryAdd(key, size)) return place;
+    return m_fields.Add(key, size, GetInfo().storeHint);
+  }
 
+ protected:
+  // Ends every stored value (deleting owned children) through the members
+  // of info, which must describe this object's class; the store is empty
+  // afterwards. The destructor of the most derived class calls it.
+  void DestroyFields(const OEAggregateInfo& info);
+
+ private:
+  OEFieldStore m_fields;
 };
 
 // An inner aggregate that knows the outer aggregate it belongs to: the
@@ -479,17 +606,74 @@ void OEClearList(OEAggregate* self, OEDynamicArrayTyped<T>& list, OETagID tag) {
 }
 
 // ---------------------------------------------------------------------------
+// Stored fields.
+
+// The value of a member never set.
+template <class T>
+const T& OEFieldDefault() {
+  static const T value{};
+  return value;
+}
+
+template <class T>
+const T* OEFindField(const OEAggregate* self, uint32_t key) {
+  return static_cast<const T*>(self->FindFieldValue(key));
+}
+
+// The member's value, or its type's default when it was never set.
+template <class T>
+const T& OEGetField(const OEAggregate* self, uint32_t key) {
+  const T* value = OEFindField<T>(self, key);
+  return value ? *value : OEFieldDefault<T>();
+}
+
+// The member's value to change, made (as the type's default) when it was
+// never set. When memory is exhausted, g_allocFailed is set and a spare
+// value, kept nowhere, is answered.
+template <class T>
+T& OEFieldRef(OEAggregate* self, uint32_t key) {
+  static_assert(alignof(T) <= 8, "a stored field is at most 8-aligned");
+  if (void* value = self->FindFieldValue(key)) return *static_cast<T*>(value);
+  void* place = self->MakeFieldValue(key, static_cast<uint32_t>(sizeof(T)));
+  if (!place) {
+    g_allocFailed = 1;
+    static T s_spare{};
+    return s_spare;
+  }
+  return *new (place) T{};
+}
+
+// Copies the member from src to dst: the default when src never set it.
+template <class T>
+void OECopyField(OEAggregate* dst, const OEAggregate* src, uint32_t key) {
+  if (const T* from = OEFindField<T>(src, key))
+    OEFieldRef<T>(dst, key) = *from;
+  else if (void* to = dst->FindFieldValue(key))
+    *static_cast<T*>(to) = OEFieldDefault<T>();
+}
+
+template <class T>
+void OEDestroyValue(void* value) {
+  static_cast<T*>(value)->~T();
+}
+// A single child's place: the child goes with it.
+template <class T>
+void OEDestroyChild(void* value) {
+  delete *static_cast<T**>(value);
+}
+
+// ---------------------------------------------------------------------------
 // Generic field operations, instantiated per member.
 
-template <class C, class T, T C::*M, class Traits>
+template <class T, uint32_t Key, class Traits>
 struct OEElementOps {
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text);
   static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
-    return Traits::Write(b, tag, static_cast<const C*>(self)->*M);
+    return Traits::Write(b, tag, OEGetField<T>(self, Key));
   }
-  static void Copy(OEAggregate* dst, const OEAggregate* src) { static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M; }
+  static void Copy(OEAggregate* dst, const OEAggregate* src) { OECopyField<T>(dst, src, Key); }
   static unsigned short Text(const OEAggregate* self, unsigned short, OEString& out) {
-    return Traits::ToText(static_cast<const C*>(self)->*M, out);
+    return Traits::ToText(OEGetField<T>(self, Key), out);
   }
 };
 
@@ -501,19 +685,19 @@ struct OETextTraits {
   }
 };
 
-template <class C, class T, T C::*M, class Traits>
-unsigned short OEElementOps<C, T, M, Traits>::SetText(OEAggregate* self, OETagID tag, const OEString& text) {
-  T& field = static_cast<C*>(self)->*M;
+template <class T, uint32_t Key, class Traits>
+unsigned short OEElementOps<T, Key, Traits>::SetText(OEAggregate* self, OETagID tag, const OEString& text) {
+  T& field = OEFieldRef<T>(self, Key);
   if constexpr (std::is_same<Traits, OETextTraits>::value)
     return OESetTextField(self, field, tag, text);
   else
     return OESetFromText<Traits>(self, field, tag, text);
 }
 
-template <class C, class T, T* C::*M>
+template <class T, uint32_t Key>
 struct OEChildOps {
-  static T*& Ref(OEAggregate* self) { return static_cast<C*>(self)->*M; }
-  static T* Ref(const OEAggregate* self) { return static_cast<const C*>(self)->*M; }
+  static T*& Ref(OEAggregate* self) { return OEFieldRef<T*>(self, Key); }
+  static T* Ref(const OEAggregate* self) { return OEGetField<T*>(self, Key); }
   static OEDataObj* Create(OEDataObjFactory* f, OETagID tag) { return OEChildCreator<T>::Make(f, tag); }
   static unsigned short Count(const OEAggregate* self) { return Ref(self) ? 1 : 0; }
   static OEDataObj* Get(const OEAggregate* self, unsigned short i) { return i == 0 ? Ref(self) : nullptr; }
@@ -524,33 +708,37 @@ struct OEChildOps {
     return 1;
   }
   static void Reset(OEAggregate* self) {
-    T*& field = Ref(self);
-    delete field;
-    field = nullptr;
+    if (void* place = self->FindFieldValue(Key)) {
+      T*& field = *static_cast<T**>(place);
+      delete field;
+      field = nullptr;
+    }
   }
 };
 
-template <class C, class T, OEDynamicArrayTyped<T> C::*M>
+template <class T, uint32_t Key>
 struct OEListOps {
-  static OEDynamicArrayTyped<T>& Ref(OEAggregate* self) { return static_cast<C*>(self)->*M; }
-  static const OEDynamicArrayTyped<T>& Ref(const OEAggregate* self) { return static_cast<const C*>(self)->*M; }
+  using List = OEDynamicArrayTyped<T>;
+  static List& Ref(OEAggregate* self) { return OEFieldRef<List>(self, Key); }
+  static const List& Ref(const OEAggregate* self) { return OEGetField<List>(self, Key); }
   static OEDataObj* Create(OEDataObjFactory* f, OETagID tag) { return OEChildCreator<T>::Make(f, tag); }
   static unsigned short Count(const OEAggregate* self) { return Ref(self).Entries(); }
   static OEDataObj* Get(const OEAggregate* self, unsigned short i) { return Ref(self).Get(i); }
-  static unsigned short Put(OEAggregate* self, OEDataObj* child) {
-    return Ref(self).Append(static_cast<T*>(child));
+  static unsigned short Put(OEAggregate* self, OEDataObj* child) { return Ref(self).Append(static_cast<T*>(child)); }
+  static void Reset(OEAggregate* self) {
+    if (void* place = self->FindFieldValue(Key)) static_cast<List*>(place)->DeleteAll();
   }
-  static void Reset(OEAggregate* self) { Ref(self).DeleteAll(); }
 };
 
-template <class C, class T, OEDynamicArrayTyped<T> C::*M, class Traits>
+template <class T, uint32_t Key, class Traits>
 struct OEValuesOps {
+  using List = OEDynamicArrayTyped<T>;
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {
-    OEDynamicArrayTyped<T>& list = static_cast<C*>(self)->*M;
+    List& list = OEFieldRef<List>(self, Key);
     return OESetValuesText<Traits>(self, list, list.Entries(), tag, text);
   }
   static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
-    const OEDynamicArrayTyped<T>& list = static_cast<const C*>(self)->*M;
+    const List& list = OEGetField<List>(self, Key);
     for (unsigned short i = 0; i < list.Entries(); ++i) {
       const T* value = list.Get(i);
       if (!value) continue;
@@ -560,15 +748,18 @@ struct OEValuesOps {
     return OE_BUILD_OK;
   }
   static void Copy(OEAggregate* dst, const OEAggregate* src) {
-    OEDynamicArrayTyped<T>& to = static_cast<C*>(dst)->*M;
-    const OEDynamicArrayTyped<T>& from = static_cast<const C*>(src)->*M;
+    const List* from = OEFindField<List>(src, Key);
+    void* place = dst->FindFieldValue(Key);
+    if (!from && !place) return;
+    List& to = OEFieldRef<List>(dst, Key);
     to.DeleteAll();
-    for (unsigned short i = 0; i < from.Entries(); ++i)
-      if (const T* v = from.Get(i)) to.SetVal(i, *v);
+    if (!from) return;
+    for (unsigned short i = 0; i < from->Entries(); ++i)
+      if (const T* v = from->Get(i)) to.SetVal(i, *v);
   }
-  static unsigned short Count(const OEAggregate* self) { return (static_cast<const C*>(self)->*M).Entries(); }
+  static unsigned short Count(const OEAggregate* self) { return OEGetField<List>(self, Key).Entries(); }
   static unsigned short Text(const OEAggregate* self, unsigned short i, OEString& out) {
-    const T* value = (static_cast<const C*>(self)->*M).Get(i);
+    const T* value = OEGetField<List>(self, Key).Get(i);
     return value ? Traits::ToText(*value, out) : 0;
   }
 };
@@ -580,75 +771,78 @@ struct OEValuesOps {
 
 #define OE_DECLARE_TEXT(Name, TAG, Type)                                                      \
  public:                                                                                      \
-  const Type& Get##Name() const { return m_##Name; }                                          \
-  unsigned short Set##Name(const OEString& text) { return OESetTextField(this, m_##Name, OE_TAG_##TAG, text); } \
+  const Type& Get##Name() const { return OEGetField<Type>(this, OE_FIELD_KEY(Name)); }        \
+  unsigned short Set##Name(const OEString& text) { return OESetTextField(this, Field##Name(), OE_TAG_##TAG, text); } \
                                                                                               \
  protected:                                                                                   \
-  Type m_##Name;
+  Type& Field##Name() { return OEFieldRef<Type>(this, OE_FIELD_KEY(Name)); }
 
 #define OE_DECLARE_VALUE(Name, TAG, Type)                                                     \
  public:                                                                                      \
-  const Type& Get##Name() const { return m_##Name; }                                          \
-  unsigned short Set##Name(const Type& value) { return OESetValueField(this, m_##Name, OE_TAG_##TAG, value); } \
+  const Type& Get##Name() const { return OEGetField<Type>(this, OE_FIELD_KEY(Name)); }        \
+  unsigned short Set##Name(const Type& value) { return OESetValueField(this, Field##Name(), OE_TAG_##TAG, value); } \
   unsigned short Set##Name(const OEString& text) {                                            \
-    return OESetFromText<OEValueTraits<Type>>(this, m_##Name, OE_TAG_##TAG, text);                    \
+    return OESetFromText<OEValueTraits<Type>>(this, Field##Name(), OE_TAG_##TAG, text);       \
   }                                                                                           \
                                                                                               \
  protected:                                                                                   \
-  Type m_##Name{};
+  Type& Field##Name() { return OEFieldRef<Type>(this, OE_FIELD_KEY(Name)); }
 
 #define OE_DECLARE_FLAG(Name, TAG, Type)                                                      \
  public:                                                                                      \
-  unsigned short Get##Name() const { return m_##Name; }                                       \
+  unsigned short Get##Name() const { return OEGetField<unsigned short>(this, OE_FIELD_KEY(Name)); } \
   unsigned short Set##Name(unsigned short flag) {                                             \
-    return OESetValueField(this, m_##Name, OE_TAG_##TAG, static_cast<unsigned short>(flag ? 1 : 0)); \
+    return OESetValueField(this, Field##Name(), OE_TAG_##TAG, static_cast<unsigned short>(flag ? 1 : 0)); \
   }                                                                                           \
-  unsigned short Set##Name(const OEString& text) { return OESetFromText<OEFlagTraits>(this, m_##Name, OE_TAG_##TAG, text); } \
+  unsigned short Set##Name(const OEString& text) { return OESetFromText<OEFlagTraits>(this, Field##Name(), OE_TAG_##TAG, text); } \
                                                                                               \
  protected:                                                                                   \
-  unsigned short m_##Name = 0;
+  unsigned short& Field##Name() { return OEFieldRef<unsigned short>(this, OE_FIELD_KEY(Name)); }
 
 #define OE_DECLARE_CHILD(Name, TAG, Type)                                \
  public:                                                                 \
-  Type* Get##Name() const { return m_##Name; }                           \
-  Type* Get##Name(unsigned short create) { return OEGetOrMakeChild(this, m_##Name, create, OE_TAG_##TAG); } \
-  unsigned short Set##Name(Type* child) { return OESetChildField(this, m_##Name, child); } \
+  Type* Get##Name() const { return OEGetField<Type*>(this, OE_FIELD_KEY(Name)); } \
+  Type* Get##Name(unsigned short create) {                               \
+    if (!create) return Get##Name();                                     \
+    return OEGetOrMakeChild(this, Field##Name(), create, OE_TAG_##TAG);  \
+  }                                                                      \
+  unsigned short Set##Name(Type* child) { return OESetChildField(this, Field##Name(), child); } \
                                                                          \
  protected:                                                              \
-  Type* m_##Name = nullptr;
+  Type*& Field##Name() { return OEFieldRef<Type*>(this, OE_FIELD_KEY(Name)); }
 
 #define OE_DECLARE_ALSO(Name, TAG, Type)
 
 #define OE_DECLARE_LIST(Name, TAG, Type)                                                          \
  public:                                                                                          \
-  unsigned short GetNum##Name() const { return m_##Name.Entries(); }                              \
-  Type* Get##Name(unsigned short i) const { return m_##Name.Get(i); }                             \
-  unsigned short Set##Name(unsigned short i, Type* child) { return OESetListElement(this, m_##Name, i, child); } \
-  unsigned short Append##Name(Type* child) { return OESetListElement(this, m_##Name, m_##Name.Entries(), child); } \
-  void Clear##Name() { OEClearList(this, m_##Name, OE_TAG_##TAG); }                                       \
+  unsigned short GetNum##Name() const { return OEGetField<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)).Entries(); } \
+  Type* Get##Name(unsigned short i) const { return OEGetField<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)).Get(i); } \
+  unsigned short Set##Name(unsigned short i, Type* child) { return OESetListElement(this, Field##Name(), i, child); } \
+  unsigned short Append##Name(Type* child) { return Set##Name(GetNum##Name(), child); }           \
+  void Clear##Name() { OEClearList(this, Field##Name(), OE_TAG_##TAG); }                          \
                                                                                                   \
  protected:                                                                                       \
-  OEDynamicArrayTyped<Type> m_##Name;
+  OEDynamicArrayTyped<Type>& Field##Name() { return OEFieldRef<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)); }
 
 // ALSOLIST: a further tag for the LIST field Name declared before.
 #define OE_DECLARE_ALSOLIST(Name, TAG, Type)
 
 #define OE_DECLARE_VALUES(Name, TAG, Type)                                                        \
  public:                                                                                          \
-  unsigned short GetNum##Name() const { return m_##Name.Entries(); }                              \
-  const Type* Get##Name(unsigned short i) const { return m_##Name.Get(i); }                       \
+  unsigned short GetNum##Name() const { return OEGetField<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)).Entries(); } \
+  const Type* Get##Name(unsigned short i) const { return OEGetField<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)).Get(i); } \
   unsigned short Set##Name(unsigned short i, const Type& value) {                                 \
-    return OESetValuesElement(this, m_##Name, i, OE_TAG_##TAG, value);                           \
+    return OESetValuesElement(this, Field##Name(), i, OE_TAG_##TAG, value);                       \
   }                                                                                               \
   unsigned short Set##Name(unsigned short i, const OEString& text) {                              \
-    return OESetValuesText<OEValueTraits<Type>>(this, m_##Name, i, OE_TAG_##TAG, text);           \
+    return OESetValuesText<OEValueTraits<Type>>(this, Field##Name(), i, OE_TAG_##TAG, text);      \
   }                                                                                               \
-  unsigned short Append##Name(const Type& value) { return Set##Name(m_##Name.Entries(), value); } \
-  unsigned short Append##Name(const OEString& text) { return Set##Name(m_##Name.Entries(), text); } \
-  void Clear##Name() { OEClearList(this, m_##Name, OE_TAG_##TAG); }                                       \
+  unsigned short Append##Name(const Type& value) { return Set##Name(GetNum##Name(), value); }     \
+  unsigned short Append##Name(const OEString& text) { return Set##Name(GetNum##Name(), text); }   \
+  void Clear##Name() { OEClearList(this, Field##Name(), OE_TAG_##TAG); }                          \
                                                                                                   \
  protected:                                                                                       \
-  OEDynamicArrayTyped<Type> m_##Name;
+  OEDynamicArrayTyped<Type>& Field##Name() { return OEFieldRef<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)); }
 
 // The class body of an aggregate: construction, destruction, its description
 // and DeepCopyFrom, then the fields of FIELDS.
@@ -676,51 +870,52 @@ struct OEValuesOps {
 #define OE_FIELD_DESC(KIND, Name, TAG, Type) OE_DESC_##KIND(Name, TAG, Type)
 #define OE_DESC_ELEMENT_(Name, TAG, Type, Traits)                                                        \
   OEFieldDesc{OE_TAG_##TAG, OE_FIELD_ELEMENT, false,                                                     \
-              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::SetText,                    \
-              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Write,                      \
-              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Copy,                       \
-              &OEElementOps<ThisClass, Type, &ThisClass::m_##Name, Traits>::Text,                       \
-              nullptr, nullptr, nullptr, nullptr, nullptr, #Name, nullptr},
+              &OEElementOps<Type, OE_FIELD_KEY(Name), Traits>::SetText,                                 \
+              &OEElementOps<Type, OE_FIELD_KEY(Name), Traits>::Write,                                   \
+              &OEElementOps<Type, OE_FIELD_KEY(Name), Traits>::Copy,                                    \
+              &OEElementOps<Type, OE_FIELD_KEY(Name), Traits>::Text,                                    \
+              nullptr, nullptr, nullptr, nullptr, nullptr, #Name, nullptr,                               \
+              OE_FIELD_KEY(Name), &OEDestroyValue<Type>},
 #define OE_DESC_TEXT(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OETextTraits)
 #define OE_DESC_VALUE(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, Type, OEValueTraits<Type>)
 #define OE_DESC_FLAG(Name, TAG, Type) OE_DESC_ELEMENT_(Name, TAG, unsigned short, OEFlagTraits)
 #define OE_DESC_CHILD_(Name, TAG, Type, alias)                                                           \
   OEFieldDesc{OE_TAG_##TAG, OE_FIELD_CHILD, alias, nullptr, nullptr, nullptr, nullptr,                  \
-              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                               \
-              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
-              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
-              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                  \
-              &OEChildOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
+              &OEChildOps<Type, OE_FIELD_KEY(Name)>::Create,                                            \
+              &OEChildOps<Type, OE_FIELD_KEY(Name)>::Count,                                             \
+              &OEChildOps<Type, OE_FIELD_KEY(Name)>::Get,                                               \
+              &OEChildOps<Type, OE_FIELD_KEY(Name)>::Put,                                               \
+              &OEChildOps<Type, OE_FIELD_KEY(Name)>::Reset, #Name, OELinkerOf<Type>(),                  \
+              OE_FIELD_KEY(Name), &OEDestroyChild<Type>},
 #define OE_DESC_CHILD(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, false)
 #define OE_DESC_ALSO(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, true)
-#define OE_DESC_LIST(Name, TAG, Type)                                                                    \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, false, nullptr, nullptr, nullptr, nullptr,                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
-#define OE_DESC_ALSOLIST(Name, TAG, Type)                                                                \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, true, nullptr, nullptr, nullptr, nullptr,                    \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                 \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Put,                                   \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, OELinkerOf<Type>()},
+// A list field; PUT is how a child read is stored (OEListOps<...>::Put).
+#define OE_DESC_LIST_(Name, TAG, Type, alias, PUT)                                                       \
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, alias, nullptr, nullptr, nullptr, nullptr,                   \
+              &OEListOps<Type, OE_FIELD_KEY(Name)>::Create,                                             \
+              &OEListOps<Type, OE_FIELD_KEY(Name)>::Count,                                              \
+              &OEListOps<Type, OE_FIELD_KEY(Name)>::Get, PUT,                                           \
+              &OEListOps<Type, OE_FIELD_KEY(Name)>::Reset, #Name, OELinkerOf<Type>(),                   \
+              OE_FIELD_KEY(Name), &OEDestroyValue<OEDynamicArrayTyped<Type>>},
+#define OE_DESC_LIST(Name, TAG, Type) \
+  OE_DESC_LIST_(Name, TAG, Type, false, (&OEListOps<Type, OE_FIELD_KEY(Name)>::Put))
+#define OE_DESC_ALSOLIST(Name, TAG, Type) \
+  OE_DESC_LIST_(Name, TAG, Type, true, (&OEListOps<Type, OE_FIELD_KEY(Name)>::Put))
 #define OE_DESC_VALUES(Name, TAG, Type)                                                                  \
   OEFieldDesc{OE_TAG_##TAG, OE_FIELD_VALUES, false,                                                     \
-              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::SetText,        \
-              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Write,          \
-              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Copy,           \
-              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Text, nullptr,  \
-              &OEValuesOps<ThisClass, Type, &ThisClass::m_##Name, OEValueTraits<Type>>::Count,          \
-              nullptr, nullptr, nullptr, #Name, nullptr},
+              &OEValuesOps<Type, OE_FIELD_KEY(Name), OEValueTraits<Type>>::SetText,                     \
+              &OEValuesOps<Type, OE_FIELD_KEY(Name), OEValueTraits<Type>>::Write,                       \
+              &OEValuesOps<Type, OE_FIELD_KEY(Name), OEValueTraits<Type>>::Copy,                        \
+              &OEValuesOps<Type, OE_FIELD_KEY(Name), OEValueTraits<Type>>::Text, nullptr,               \
+              &OEValuesOps<Type, OE_FIELD_KEY(Name), OEValueTraits<Type>>::Count,                       \
+              nullptr, nullptr, nullptr, #Name, nullptr,                                                \
+              OE_FIELD_KEY(Name), &OEDestroyValue<OEDynamicArrayTyped<Type>>},
 
 // Defines construction (setting the default type), destruction and the class
 // description. DESCRIPTION continues the description: .Valid(...) and so on.
 #define OE_DEFINE_AGGREGATE(Class, Base, FIELDS, DEFAULT_TYPE, DESCRIPTION)                  \
   Class::Class() { SetType(OE_TAG_##DEFAULT_TYPE); }                                         \
-  Class::~Class() { DestroyOwnFields(ClassInfo()); }                                         \
+  Class::~Class() { DestroyFields(ClassInfo()); }                                         \
   const OEAggregateInfo& Class::ClassInfo() {                                                \
     using ThisClass [[maybe_unused]] = Class;                                                \
     static OEAggregateInfo info =                                                            \

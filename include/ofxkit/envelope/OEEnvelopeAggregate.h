@@ -24,14 +24,14 @@
 // setter's body.
 #define OE_DECLARE_TRAITS(Name, TAG, Traits)                                                              \
  public:                                                                                                  \
-  const Traits::Type& Get##Name() const { return m_##Name; }                                              \
-  unsigned short Set##Name(const Traits::Type& value) { return Traits::Store(this, m_##Name, OE_TAG_##TAG, value); } \
+  const Traits::Type& Get##Name() const { return OEGetField<Traits::Type>(this, OE_FIELD_KEY(Name)); }   \
+  unsigned short Set##Name(const Traits::Type& value) { return Traits::Store(this, Field##Name(), OE_TAG_##TAG, value); } \
   unsigned short Set##Name(const OEString& text) {                                                        \
-    return OESetFromText<Traits>(this, m_##Name, OE_TAG_##TAG, text);                                     \
+    return OESetFromText<Traits>(this, Field##Name(), OE_TAG_##TAG, text);                                \
   }                                                                                                       \
                                                                                                           \
  protected:                                                                                               \
-  Traits::Type m_##Name{};
+  Traits::Type& Field##Name() { return OEFieldRef<Traits::Type>(this, OE_FIELD_KEY(Name)); }
 #define OE_DESC_TRAITS(Name, TAG, Traits) OE_DESC_ELEMENT_(Name, TAG, Traits::Type, Traits)
 
 // The typed setter of most TRAITS fields: store and mark present.
@@ -48,17 +48,17 @@ struct OEPlainStore {
 // held and marks no tag present.
 #define OE_DECLARE_INNER(Name, TAG, Type)                              \
  public:                                                               \
-  Type* Get##Name() const { return m_##Name; }                         \
+  Type* Get##Name() const { return OEGetField<Type*>(this, OE_FIELD_KEY(Name)); } \
   unsigned short Set##Name(Type* inner) {                              \
-    if (m_##Name || !inner) return 0;                                  \
-    m_##Name = inner;                                                  \
+    if (Get##Name() || !inner) return 0;                               \
+    Field##Name() = inner;                                             \
     return 1;                                                          \
   }                                                                    \
   /* Gives the inner aggregate back to the caller, who owns it now. */ \
-  Type* Disconnect##Name() { return OEDisconnectChild(this, m_##Name); } \
+  Type* Disconnect##Name() { return Get##Name() ? OEDisconnectChild(this, Field##Name()) : nullptr; } \
                                                                        \
  protected:                                                            \
-  Type* m_##Name = nullptr;
+  Type*& Field##Name() { return OEFieldRef<Type*>(this, OE_FIELD_KEY(Name)); }
 #define OE_DESC_INNER(Name, TAG, Type) OE_DESC_CHILD_(Name, TAG, Type, false)
 
 // WRAPPERS: repeated transaction or sync wrappers of several tags (the tag
@@ -68,21 +68,16 @@ struct OEPlainStore {
 // deleting it.
 #define OE_DECLARE_WRAPPERS(Name, TAG, Type)                                                         \
  public:                                                                                             \
-  unsigned short GetNum##Name() const { return m_##Name.Entries(); }                                 \
-  Type* Get##Name(unsigned short i) const { return m_##Name.Get(i); }                                \
-  unsigned short Set##Name(unsigned short i, Type* w) { return OEStoreWrapper(this, m_##Name, i, w); } \
-  unsigned short Append##Name(Type* w) { return OEStoreWrapper(this, m_##Name, m_##Name.Entries(), w); } \
-  unsigned short Disconnect##Name(unsigned short i) { return m_##Name.UnSet(i); }                    \
+  unsigned short GetNum##Name() const { return OEGetField<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)).Entries(); } \
+  Type* Get##Name(unsigned short i) const { return OEGetField<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)).Get(i); } \
+  unsigned short Set##Name(unsigned short i, Type* w) { return OEStoreWrapper(this, Field##Name(), i, w); } \
+  unsigned short Append##Name(Type* w) { return Set##Name(GetNum##Name(), w); }                     \
+  unsigned short Disconnect##Name(unsigned short i) { return Field##Name().UnSet(i); }               \
                                                                                                      \
  protected:                                                                                          \
-  OEDynamicArrayTyped<Type> m_##Name;
-#define OE_DESC_WRAPPERS(Name, TAG, Type)                                                               \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_LIST, false, nullptr, nullptr, nullptr, nullptr,                  \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Create,                               \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Count,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Get,                                  \
-              &OEWrapperListPut<ThisClass, Type, &ThisClass::m_##Name>,                                \
-              &OEListOps<ThisClass, Type, &ThisClass::m_##Name>::Reset, #Name, nullptr},
+  OEDynamicArrayTyped<Type>& Field##Name() { return OEFieldRef<OEDynamicArrayTyped<Type>>(this, OE_FIELD_KEY(Name)); }
+#define OE_DESC_WRAPPERS(Name, TAG, Type) \
+  OE_DESC_LIST_(Name, TAG, Type, false, (&OEWrapperListPut<Type, OE_FIELD_KEY(Name)>))
 
 // ---------------------------------------------------------------------------
 
@@ -138,10 +133,10 @@ T* OEDisconnectChild(OEAggregate* self, T*& field) {
   return held;
 }
 
-template <class C, class T, OEDynamicArrayTyped<T> C::*M>
+template <class T, uint32_t Key>
 unsigned short OEWrapperListPut(OEAggregate* self, OEDataObj* child) {
-  C* holder = static_cast<C*>(self);
-  return OEStoreWrapper(holder, holder->*M, (holder->*M).Entries(), static_cast<T*>(child));
+  OEDynamicArrayTyped<T>& list = OEFieldRef<OEDynamicArrayTyped<T>>(self, Key);
+  return OEStoreWrapper(static_cast<OEEnvelopeAggregate*>(self), list, list.Entries(), static_cast<T*>(child));
 }
 
 // The description of one type of a class of OE_AGGREGATE_BY_TYPE: the

@@ -43,8 +43,8 @@ class OEMessageSetRq : public OEMessageSetBase<OEMessageSetRq, false> {
   OE_AGGREGATE_BY_TYPE(OEMessageSetRq, OE_MESSAGESETRQ_FIELDS)
 
   // Gives the sign-on request back to the caller, who owns it now.
-  OESignOnRq* DisconnectSignOnRq() { return OEDisconnectChild(this, m_SignOnRq); }
-  OEDataObj* GetSignOnObject() const { return m_SignOnRq; }
+  OESignOnRq* DisconnectSignOnRq() { return GetSignOnRq() ? OEDisconnectChild(this, FieldSignOnRq()) : nullptr; }
+  OEDataObj* GetSignOnObject() const { return GetSignOnRq(); }
 
   // The profile's message-set tag ("BANKMSGSET", ...) for an inner request
   // tag; 0 for a tag that belongs to none.
@@ -60,8 +60,8 @@ class OEMessageSetRq : public OEMessageSetBase<OEMessageSetRq, false> {
 class OEMessageSetRs : public OEMessageSetBase<OEMessageSetRs, true> {
   OE_AGGREGATE_BY_TYPE(OEMessageSetRs, OE_MESSAGESETRS_FIELDS)
 
-  OESignOnRs* DisconnectSignOnRs() { return OEDisconnectChild(this, m_SignOnRs); }
-  OEDataObj* GetSignOnObject() const { return m_SignOnRs; }
+  OESignOnRs* DisconnectSignOnRs() { return GetSignOnRs() ? OEDisconnectChild(this, FieldSignOnRs()) : nullptr; }
+  OEDataObj* GetSignOnObject() const { return GetSignOnRs(); }
 };
 
 extern template class OEMessageSetBase<OEMessageSetRq, false>;

@@ -53,7 +53,7 @@ class OESignOnRq : public OEAggregate {
   unsigned short AllRequiredPresent() override;
   OETagID GetFirstMissingRequiredTag(OETagID after) const override;
   // One child position, the financial institution (possibly null).
-  OEDataObj* GetChild(unsigned short index) const override { return index == 0 ? m_FI : nullptr; }
+  OEDataObj* GetChild(unsigned short index) const override { return index == 0 ? GetFI() : nullptr; }
   unsigned short GetNumberOfChildren() const override { return 1; }
 };
 

@@ -28,7 +28,7 @@ class OEStatus : public OEEnvelopeAggregate {
   // The OFX code of a client that is up to date.
   static constexpr int32_t kCodeUpToDate = 1;
   // True when SEVERITY is present and is ERROR.
-  bool IsError() const { return ValidateTag(OE_TAG_SEVERITY) && m_Severity == OE_SEVERITY_ERROR; }
+  bool IsError() const { return ValidateTag(OE_TAG_SEVERITY) && GetSeverity() == OE_SEVERITY_ERROR; }
   // True when CODE is present and is 1.
-  bool IsUpToDate() const { return ValidateTag(OE_TAG_CODE) && m_Code == kCodeUpToDate; }
+  bool IsUpToDate() const { return ValidateTag(OE_TAG_CODE) && GetCode() == kCodeUpToDate; }
 };

@@ -44,7 +44,7 @@ class OETransRq : public OEWrapperAggregate {
   // An inner request held, TRNUID, and the wrapper's inner tag.
   unsigned short AllRequiredPresent() override;
   // Every position answers the inner request.
-  OEDataObj* GetChild(unsigned short) const override { return m_ActualTrans; }
+  OEDataObj* GetChild(unsigned short) const override { return GetActualTrans(); }
 };
 
 #define OE_TRANSRS_FIELDS(X)                            \

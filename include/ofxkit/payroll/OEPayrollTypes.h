@@ -218,34 +218,36 @@ struct OEPayrollTextTraits {
   }
 };
 
-template <class C, class T, T C::*M>
+template <class T, uint32_t Key>
 struct OEPayrollTextOps {
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {
-    return OESetPayrollText(self, static_cast<C*>(self)->*M, tag, text);
+    return OESetPayrollText(self, OEFieldRef<T>(self, Key), tag, text);
   }
   static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
-    return OEPayrollTextTraits::Write(b, tag, static_cast<const C*>(self)->*M);
+    return OEPayrollTextTraits::Write(b, tag, OEGetField<T>(self, Key));
   }
-  static void Copy(OEAggregate* dst, const OEAggregate* src) { static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M; }
+  static void Copy(OEAggregate* dst, const OEAggregate* src) { OECopyField<T>(dst, src, Key); }
   static unsigned short Text(const OEAggregate* self, unsigned short, OEString& out) {
-    return OEPayrollTextTraits::ToText(static_cast<const C*>(self)->*M, out);
+    return OEPayrollTextTraits::ToText(OEGetField<T>(self, Key), out);
   }
 };
 
 #define OE_DECLARE_PTEXT(Name, TAG, Type)                                                                  \
  public:                                                                                                   \
-  const Type& Get##Name() const { return m_##Name; }                                                       \
-  unsigned short Set##Name(const OEString& text) { return OESetPayrollText(this, m_##Name, OE_TAG_##TAG, text); } \
-  unsigned short Empty##Name() { return OESetPayrollText(this, m_##Name, OE_TAG_##TAG, OE_PAYROLL_EMPTY_TEXT); } \
-  unsigned short Is##Name##Emptied() const { return ValidateTag(OE_TAG_##TAG) && m_##Name.IsEmpty(); }   \
+  const Type& Get##Name() const { return OEGetField<Type>(this, OE_FIELD_KEY(Name)); }                     \
+  unsigned short Set##Name(const OEString& text) { return OESetPayrollText(this, Field##Name(), OE_TAG_##TAG, text); } \
+  unsigned short Empty##Name() { return OESetPayrollText(this, Field##Name(), OE_TAG_##TAG, OE_PAYROLL_EMPTY_TEXT); } \
+  unsigned short Is##Name##Emptied() const { return ValidateTag(OE_TAG_##TAG) && Get##Name().IsEmpty(); }  \
                                                                                                            \
  protected:                                                                                                \
-  Type m_##Name;
+  Type& Field##Name() { return OEFieldRef<Type>(this, OE_FIELD_KEY(Name)); }
 
 #define OE_DESC_PTEXT(Name, TAG, Type)                                                        \
   OEFieldDesc{OE_TAG_##TAG, OE_FIELD_ELEMENT, false,                                          \
-              &OEPayrollTextOps<ThisClass, Type, &ThisClass::m_##Name>::SetText,             \
-              &OEPayrollTextOps<ThisClass, Type, &ThisClass::m_##Name>::Write,               \
-              &OEPayrollTextOps<ThisClass, Type, &ThisClass::m_##Name>::Copy,                \
-              &OEPayrollTextOps<ThisClass, Type, &ThisClass::m_##Name>::Text,                \
-              nullptr, nullptr, nullptr, nullptr, nullptr, #Name, nullptr},
+              &OEPayrollTextOps<Type, OE_FIELD_KEY(Name)>::SetText,                           \
+              &OEPayrollTextOps<Type, OE_FIELD_KEY(Name)>::Write,                             \
+              &OEPayrollTextOps<Type, OE_FIELD_KEY(Name)>::Copy,                              \
+              &OEPayrollTextOps<Type, OE_FIELD_KEY(Name)>::Text,                              \
+              nullptr, nullptr, nullptr, nullptr, nullptr, #Name, nullptr,                     \
+              OE_FIELD_KEY(Name), &OEDestroyValue<Type>},
+

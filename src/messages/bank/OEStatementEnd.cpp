@@ -45,9 +45,9 @@ T* Disconnect(OEAggregate* self, OEDynamicArrayTyped<T>& list, unsigned short in
 }  // namespace
 
 OEClosing* OEStatementEndRs::DisconnectClosing(unsigned short index) {
-  return Disconnect(this, m_Closing, index, OE_TAG_CLOSING);
+  return Disconnect(this, FieldClosing(), index, OE_TAG_CLOSING);
 }
 
 OECCClosing* OECCStatementEndRs::DisconnectCCClosing(unsigned short index) {
-  return Disconnect(this, m_CCClosing, index, OE_TAG_CCCLOSING);
+  return Disconnect(this, FieldCCClosing(), index, OE_TAG_CCCLOSING);
 }

@@ -9,13 +9,13 @@ OE_DEFINE_AGGREGATE(OEXferInfo, OEAggregate, OE_XFERINFO_FIELDS, XFERINFO,
                     .Alternatives(OE_TAGS(BANKACCTTO, CCACCTTO)))
 
 OEBankOrCCAccount* OEXferInfo::GetAccountFrom() const {
-  if (m_BankAcctFrom) return m_BankAcctFrom;
-  return m_CCAcctFrom;
+  if (OEBankAccount* bank = GetBankAcctFrom()) return bank;
+  return GetCCAcctFrom();
 }
 
 OEBankOrCCAccount* OEXferInfo::GetAccountTo() const {
-  if (m_BankAcctTo) return m_BankAcctTo;
-  return m_CCAcctTo;
+  if (OEBankAccount* bank = GetBankAcctTo()) return bank;
+  return GetCCAcctTo();
 }
 
 namespace {
@@ -38,11 +38,11 @@ unsigned short PutAccount(OEAggregate* self, OEBankOrCCAccount* account, OEBankA
 }  // namespace
 
 unsigned short OEXferInfo::SetAccountFrom(OEBankOrCCAccount* account) {
-  return PutAccount(this, account, m_BankAcctFrom, OE_TAG_BANKACCTFROM, m_CCAcctFrom, OE_TAG_CCACCTFROM);
+  return PutAccount(this, account, FieldBankAcctFrom(), OE_TAG_BANKACCTFROM, FieldCCAcctFrom(), OE_TAG_CCACCTFROM);
 }
 
 unsigned short OEXferInfo::SetAccountTo(OEBankOrCCAccount* account) {
-  return PutAccount(this, account, m_BankAcctTo, OE_TAG_BANKACCTTO, m_CCAcctTo, OE_TAG_CCACCTTO);
+  return PutAccount(this, account, FieldBankAcctTo(), OE_TAG_BANKACCTTO, FieldCCAcctTo(), OE_TAG_CCACCTTO);
 }
 
 OE_DEFINE_AGGREGATE(OEXferProcessingStatus, OEAggregate, OE_XFERPROCESSINGSTATUS_FIELDS, XFERPRCSTS,

@@ -26,36 +26,33 @@ unsigned short OESetMailBody(OEAggregate* self, OEEMailMsgBody& field, OETagID t
 // servers expect of a text that may span lines.
 #define OE_DECLARE_MAILBODY(Name, TAG, Type)                                                           \
  public:                                                                                               \
-  const Type& Get##Name() const { return m_##Name; }                                                   \
-  unsigned short Set##Name(const OEString& text) { return OESetMailBody(this, m_##Name, OE_TAG_##TAG, text); } \
+  const Type& Get##Name() const { return OEGetField<Type>(this, OE_FIELD_KEY(Name)); }                 \
+  unsigned short Set##Name(const OEString& text) { return OESetMailBody(this, Field##Name(), OE_TAG_##TAG, text); } \
                                                                                                        \
  protected:                                                                                            \
-  Type m_##Name;
+  Type& Field##Name() { return OEFieldRef<Type>(this, OE_FIELD_KEY(Name)); }
 
-template <class C, OEEMailMsgBody C::*M>
+template <uint32_t Key>
 struct OEMailBodyOps {
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {
-    return OESetMailBody(self, static_cast<C*>(self)->*M, tag, text);
+    return OESetMailBody(self, OEFieldRef<OEEMailMsgBody>(self, Key), tag, text);
   }
   static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
-    OEBuildStatus status = b->AddTagOEString(tag, static_cast<const C*>(self)->*M);
+    OEBuildStatus status = b->AddTagOEString(tag, OEGetField<OEEMailMsgBody>(self, Key));
     return status != OE_BUILD_OK ? status : b->AddTagEnd(tag);
   }
-  static void Copy(OEAggregate* dst, const OEAggregate* src) {
-    static_cast<C*>(dst)->*M = static_cast<const C*>(src)->*M;
-  }
+  static void Copy(OEAggregate* dst, const OEAggregate* src) { OECopyField<OEEMailMsgBody>(dst, src, Key); }
   static unsigned short Text(const OEAggregate* self, unsigned short, OEString& out) {
-    out = static_cast<const C*>(self)->*M;
+    out = OEGetField<OEEMailMsgBody>(self, Key);
     return 1;
   }
 };
 
 #define OE_DESC_MAILBODY(Name, TAG, Type)                                                                     \
-  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_ELEMENT, false, &OEMailBodyOps<ThisClass, &ThisClass::m_##Name>::SetText, \
-              &OEMailBodyOps<ThisClass, &ThisClass::m_##Name>::Write,                                        \
-              &OEMailBodyOps<ThisClass, &ThisClass::m_##Name>::Copy,                                         \
-              &OEMailBodyOps<ThisClass, &ThisClass::m_##Name>::Text,                                         \
-              nullptr, nullptr, nullptr, nullptr, nullptr, #Name, nullptr},
+  OEFieldDesc{OE_TAG_##TAG, OE_FIELD_ELEMENT, false, &OEMailBodyOps<OE_FIELD_KEY(Name)>::SetText,            \
+              &OEMailBodyOps<OE_FIELD_KEY(Name)>::Write, &OEMailBodyOps<OE_FIELD_KEY(Name)>::Copy,            \
+              &OEMailBodyOps<OE_FIELD_KEY(Name)>::Text, nullptr, nullptr, nullptr, nullptr, nullptr, #Name,   \
+              nullptr, OE_FIELD_KEY(Name), &OEDestroyValue<OEEMailMsgBody>},
 
 // One message ("MAIL"). Every field is required.
 #define OE_MAIL_FIELDS(X)                                   \

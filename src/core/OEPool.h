@@ -1,0 +1,10 @@
+// Small blocks from the library's object pool (see OEDataObj::operator new):
+// the blocks aggregates keep their fields in. Sizes up to 4096 bytes come
+// from the pool's size classes, 16-byte aligned; builds with
+// AddressSanitizer use the heap.
+#pragma once
+
+#include <cstddef>
+
+void* OEPoolTake(std::size_t size) noexcept;
+void OEPoolGive(void* p, std::size_t size) noexcept;
