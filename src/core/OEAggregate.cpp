@@ -405,7 +405,7 @@ void OEAggregate::ClearTagQuietly(OETagID tag) {
 
 void OEAggregate::DestroyFields(const OEAggregateInfo& info) {
   if (m_fields.Empty()) return;
-  m_fields.ForEach([&info](uint32_t key, void* value) {
+  m_fields.ForEach([&info](uint16_t key, void* value) {
     if (const OEFieldDesc* d = info.MemberByKey(key))
       if (d->destroy) d->destroy(value);
   });
@@ -414,7 +414,7 @@ void OEAggregate::DestroyFields(const OEAggregateInfo& info) {
 
 // ---------------------------------------------------------------------------
 
-void* OEFieldStore::Add(uint32_t key, uint32_t size, const OEStoreHint& hint) {
+void* OEFieldStore::Add(uint16_t key, uint32_t size, const OEStoreHint& hint) {
   if (void* place = TryAdd(key, size)) return place;
   size = (size + 7u) & ~7u;
   const uint32_t needed = static_cast<uint32_t>(sizeof(Block) + sizeof(Entry)) + size;

@@ -234,17 +234,20 @@ struct OEFieldDesc {
   void (*link)(OEDataObj* child, OEAggregate* maker, OETagID makerType);
   // The key the member is stored under (OEFieldKey of its name), and what
   // ends its stored value (deleting an owned child).
-  uint32_t key = 0;
+  uint16_t key = 0;
   void (*destroy)(void* value) = nullptr;
 };
 
-// The key of a member's name: FNV-1a, made at compile time.
-constexpr uint32_t OEFieldKey(const char* name) {
+// The key of a member's name: FNV-1a folded to 16 bits, made at compile
+// time. Two members of one class chain under one key are a fault of the
+// class's description, reported (and the program stopped) the first time
+// the class is used; the test of every class finds it.
+constexpr uint16_t OEFieldKey(const char* name) {
   uint32_t hash = 2166136261u;
   for (; *name; ++name) hash = (hash ^ static_cast<unsigned char>(*name)) * 16777619u;
-  return hash;
+  return static_cast<uint16_t>(hash ^ (hash >> 16));
 }
-#define OE_FIELD_KEY(Name) (std::integral_constant<uint32_t, OEFieldKey(#Name)>::value)
+#define OE_FIELD_KEY(Name) (std::integral_constant<uint16_t, OEFieldKey(#Name)>::value)
 
 // How large the first block of a class's field stores is made: what the
 // last object of the class read by a parser needed. Objects of one list are
@@ -272,7 +275,7 @@ class OEFieldStore {
   ~OEFieldStore() { Release(); }
 
   // The value stored under key, or null.
-  void* Find(uint32_t key) const {
+  void* Find(uint16_t key) const {
     for (const Block* b = m_first; b; b = b->next) {
       const Entry* e = b->Entries();
       for (uint16_t i = 0; i < b->count; ++i)
@@ -283,19 +286,19 @@ class OEFieldStore {
   // Room for a new value of size bytes (at most 8-aligned) under key, in the
   // last block when it fits; null when none is left. The caller constructs
   // the value there.
-  void* TryAdd(uint32_t key, uint32_t size) {
+  void* TryAdd(uint16_t key, uint32_t size) {
     Block* b = m_last;
     if (!b) return nullptr;
     size = (size + 7u) & ~7u;
     uint32_t entriesEnd = static_cast<uint32_t>(sizeof(Block) + (b->count + 1u) * sizeof(Entry));
     if (b->valuesStart < entriesEnd + size) return nullptr;
     b->valuesStart = static_cast<uint16_t>(b->valuesStart - size);
-    b->Entries()[b->count++] = Entry{key, b->valuesStart, 0};
+    b->Entries()[b->count++] = Entry{key, b->valuesStart};
     return reinterpret_cast<char*>(b) + b->valuesStart;
   }
   // As TryAdd, with a new block when the last one is full; the hint tells
   // the size of a first block.
-  void* Add(uint32_t key, uint32_t size, const OEStoreHint& hint);
+  void* Add(uint16_t key, uint32_t size, const OEStoreHint& hint);
   bool Empty() const { return m_first == nullptr; }
   // Bytes of the blocks in use (headers, entries and values).
   uint32_t UsedBytes() const;
@@ -312,9 +315,8 @@ class OEFieldStore {
 
  private:
   struct Entry {
-    uint32_t key;
+    uint16_t key;
     uint16_t offset;
-    uint16_t unused;
   };
   struct Block {
     Block* next;
@@ -383,7 +385,7 @@ class OEAggregateInfo {
   OEStoreHint storeHint;
 
   // The member (of the class chain) stored under key, or null.
-  const OEFieldDesc* MemberByKey(uint32_t key) const {
+  const OEFieldDesc* MemberByKey(uint16_t key) const {
     for (const OEFieldDesc* d : members)
       if (d->key == key) return d;
     return nullptr;
@@ -437,10 +439,10 @@ class OEAggregate : public OEDataObj {
   const OEFieldDesc* FieldAt(OETagID tag) const;
 
   // The stored value of the member with key, or null when it was never set.
-  void* FindFieldValue(uint32_t key) const { return m_fields.Find(key); }
+  void* FindFieldValue(uint16_t key) const { return m_fields.Find(key); }
   // Room for a new value of the member with key (see OEFieldStore), or null
   // when memory is exhausted.
-  void* MakeFieldValue(uint32_t key, uint32_t size) {
+  void* MakeFieldValue(uint16_t key, uint32_t size) {
     if (void* place = m_fields.TryAdd(key, size)) return place;
     return m_fields.Add(key, size, GetInfo().storeHint);
   }
@@ -616,13 +618,13 @@ const T& OEFieldDefault() {
 }
 
 template <class T>
-const T* OEFindField(const OEAggregate* self, uint32_t key) {
+const T* OEFindField(const OEAggregate* self, uint16_t key) {
   return static_cast<const T*>(self->FindFieldValue(key));
 }
 
 // The member's value, or its type's default when it was never set.
 template <class T>
-const T& OEGetField(const OEAggregate* self, uint32_t key) {
+const T& OEGetField(const OEAggregate* self, uint16_t key) {
   const T* value = OEFindField<T>(self, key);
   return value ? *value : OEFieldDefault<T>();
 }
@@ -631,7 +633,7 @@ const T& OEGetField(const OEAggregate* self, uint32_t key) {
 // never set. When memory is exhausted, g_allocFailed is set and a spare
 // value, kept nowhere, is answered.
 template <class T>
-T& OEFieldRef(OEAggregate* self, uint32_t key) {
+T& OEFieldRef(OEAggregate* self, uint16_t key) {
   static_assert(alignof(T) <= 8, "a stored field is at most 8-aligned");
   if (void* value = self->FindFieldValue(key)) return *static_cast<T*>(value);
   void* place = self->MakeFieldValue(key, static_cast<uint32_t>(sizeof(T)));
@@ -645,7 +647,7 @@ T& OEFieldRef(OEAggregate* self, uint32_t key) {
 
 // Copies the member from src to dst: the default when src never set it.
 template <class T>
-void OECopyField(OEAggregate* dst, const OEAggregate* src, uint32_t key) {
+void OECopyField(OEAggregate* dst, const OEAggregate* src, uint16_t key) {
   if (const T* from = OEFindField<T>(src, key))
     OEFieldRef<T>(dst, key) = *from;
   else if (void* to = dst->FindFieldValue(key))
@@ -665,7 +667,7 @@ void OEDestroyChild(void* value) {
 // ---------------------------------------------------------------------------
 // Generic field operations, instantiated per member.
 
-template <class T, uint32_t Key, class Traits>
+template <class T, uint16_t Key, class Traits>
 struct OEElementOps {
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text);
   static OEBuildStatus Write(OEBuilder* b, const OEAggregate* self, OETagID tag) {
@@ -685,7 +687,7 @@ struct OETextTraits {
   }
 };
 
-template <class T, uint32_t Key, class Traits>
+template <class T, uint16_t Key, class Traits>
 unsigned short OEElementOps<T, Key, Traits>::SetText(OEAggregate* self, OETagID tag, const OEString& text) {
   T& field = OEFieldRef<T>(self, Key);
   if constexpr (std::is_same<Traits, OETextTraits>::value)
@@ -694,7 +696,7 @@ unsigned short OEElementOps<T, Key, Traits>::SetText(OEAggregate* self, OETagID 
     return OESetFromText<Traits>(self, field, tag, text);
 }
 
-template <class T, uint32_t Key>
+template <class T, uint16_t Key>
 struct OEChildOps {
   static T*& Ref(OEAggregate* self) { return OEFieldRef<T*>(self, Key); }
   static T* Ref(const OEAggregate* self) { return OEGetField<T*>(self, Key); }
@@ -716,7 +718,7 @@ struct OEChildOps {
   }
 };
 
-template <class T, uint32_t Key>
+template <class T, uint16_t Key>
 struct OEListOps {
   using List = OEDynamicArrayTyped<T>;
   static List& Ref(OEAggregate* self) { return OEFieldRef<List>(self, Key); }
@@ -730,7 +732,7 @@ struct OEListOps {
   }
 };
 
-template <class T, uint32_t Key, class Traits>
+template <class T, uint16_t Key, class Traits>
 struct OEValuesOps {
   using List = OEDynamicArrayTyped<T>;
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {

@@ -133,7 +133,7 @@ T* OEDisconnectChild(OEAggregate* self, T*& field) {
   return held;
 }
 
-template <class T, uint32_t Key>
+template <class T, uint16_t Key>
 unsigned short OEWrapperListPut(OEAggregate* self, OEDataObj* child) {
   OEDynamicArrayTyped<T>& list = OEFieldRef<OEDynamicArrayTyped<T>>(self, Key);
   return OEStoreWrapper(static_cast<OEEnvelopeAggregate*>(self), list, list.Entries(), static_cast<T*>(child));

@@ -218,7 +218,7 @@ struct OEPayrollTextTraits {
   }
 };
 
-template <class T, uint32_t Key>
+template <class T, uint16_t Key>
 struct OEPayrollTextOps {
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {
     return OESetPayrollText(self, OEFieldRef<T>(self, Key), tag, text);

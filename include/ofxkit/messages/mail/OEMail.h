@@ -32,7 +32,7 @@ unsigned short OESetMailBody(OEAggregate* self, OEEMailMsgBody& field, OETagID t
  protected:                                                                                            \
   Type& Field##Name() { return OEFieldRef<Type>(this, OE_FIELD_KEY(Name)); }
 
-template <uint32_t Key>
+template <uint16_t Key>
 struct OEMailBodyOps {
   static unsigned short SetText(OEAggregate* self, OETagID tag, const OEString& text) {
     return OESetMailBody(self, OEFieldRef<OEEMailMsgBody>(self, Key), tag, text);
