@@ -919,10 +919,13 @@ struct OEValuesOps {
   Class::Class() { SetType(OE_TAG_##DEFAULT_TYPE); }                                         \
   Class::~Class() { DestroyFields(ClassInfo()); }                                         \
   const OEAggregateInfo& Class::ClassInfo() {                                                \
-    using ThisClass [[maybe_unused]] = Class;                                                \
-    static OEAggregateInfo info =                                                            \
-        OEAggregateInfo(&Base::ClassInfo(), {FIELDS(OE_FIELD_DESC)}, OE_TAG_##DEFAULT_TYPE)  \
-            DESCRIPTION;                                                                     \
-    static const OEAggregateInfo& finished = info.Finish();                                  \
+    /* One guarded static: this runs for every tag an object is given. */                    \
+    static const OEAggregateInfo& finished = []() -> const OEAggregateInfo& {                \
+      using ThisClass [[maybe_unused]] = Class;                                              \
+      static OEAggregateInfo info =                                                          \
+          OEAggregateInfo(&Base::ClassInfo(), {FIELDS(OE_FIELD_DESC)}, OE_TAG_##DEFAULT_TYPE) \
+              DESCRIPTION;                                                                   \
+      return info.Finish();                                                                  \
+    }();                                                                                     \
     return finished;                                                                         \
   }
