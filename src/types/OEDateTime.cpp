@@ -11,6 +11,17 @@ const char* const OEDateTimeBase::m_timeZoneNotInitialized = "***";
 
 namespace {
 
+// Whether two texts are the same, ASCII letters compared without regard to case.
+bool SameLetters(const char* a, const char* b) {
+  for (;; ++a, ++b) {
+    unsigned char ca = static_cast<unsigned char>(*a), cb = static_cast<unsigned char>(*b);
+    if (ca >= 'A' && ca <= 'Z') ca = static_cast<unsigned char>(ca - 'A' + 'a');
+    if (cb >= 'A' && cb <= 'Z') cb = static_cast<unsigned char>(cb - 'A' + 'a');
+    if (ca != cb) return false;
+    if (ca == 0) return true;
+  }
+}
+
 const char kDateWhere[] = "ConvertStringToOEDateTime";
 const char kTimeWhere[] = "ConvertStringToOETime";
 const char kZoneWhere[] = "ExtractTimeZone";
@@ -144,7 +155,11 @@ OEDateTimeBase::OEDateTimeBase(unsigned short year, unsigned short month, unsign
       m_second(second),
       m_milliseconds(milliseconds),
       m_timeZoneOffset(0),
-      m_binary(nullptr) {}
+      m_zoneLength(0),
+      m_zone{},
+      m_binary(nullptr) {
+  static_assert(sizeof m_zone >= sizeof(char*), "a long zone name's address is kept in m_zone");
+}
 
 OEDateTimeBase::OEDateTimeBase(const OEDateTimeBase& other) : OEDateTimeBase() { operator=(other); }
 
@@ -163,10 +178,10 @@ unsigned short OEDateTimeBase::operator=(const OEDateTimeBase& other) {
   m_second = other.m_second;
   m_milliseconds = other.m_milliseconds;
   m_timeZoneOffset = other.m_timeZoneOffset;
-  if (other.m_timeZoneName.IsEmpty())
+  if (other.m_zoneLength == 0)
     ClearTimeZoneName();
   else
-    m_timeZoneName.Assign(other.m_timeZoneName.c_str(), other.m_timeZoneName.GetStrLength());
+    AssignTimeZoneName(other.ZoneName(), other.m_zoneLength);
   return 1;
 }
 
@@ -182,8 +197,41 @@ void OEDateTimeBase::InitOEDateTime() {
 
 void OEDateTimeBase::Invalidate() { m_year = m_month = m_day = m_hour = m_minute = m_second = 0; }
 
-// Empties the name but keeps its storage for the next one.
-void OEDateTimeBase::ClearTimeZoneName() { m_timeZoneName.Truncate(0); }
+void OEDateTimeBase::ClearTimeZoneName() {
+  if (m_zoneLength > kZoneInline) free(ZoneHeap());
+  m_zoneLength = 0;
+  m_zone[0] = '\0';
+}
+
+void OEDateTimeBase::AssignTimeZoneName(const char* name, unsigned short length) {
+  if (length <= kZoneInline) {
+    // Through a copy: name may be this value's own heap name.
+    char inlineName[kZoneInline + 1];
+    memcpy(inlineName, name, length);
+    inlineName[length] = '\0';
+    ClearTimeZoneName();
+    memcpy(m_zone, inlineName, sizeof inlineName);
+    m_zoneLength = length;
+    return;
+  }
+  char* heap = static_cast<char*>(malloc(static_cast<size_t>(length) + 1));
+  if (heap == nullptr) {
+    g_allocFailed = 1;
+    ClearTimeZoneName();
+    return;
+  }
+  memcpy(heap, name, length);
+  heap[length] = '\0';
+  ClearTimeZoneName();
+  memcpy(m_zone, &heap, sizeof heap);
+  m_zoneLength = length;
+}
+
+OEString3 OEDateTimeBase::GetTimeZoneName() const {
+  OEString3 name;
+  if (m_zoneLength) name.Assign(ZoneName(), m_zoneLength);
+  return name;
+}
 
 // ---------------------------------------------------------------------------
 // Time zones
@@ -199,11 +247,11 @@ unsigned short OEDateTimeBase::SetTimeZone(const char* name, unsigned short name
     ClearTimeZoneName();
     return 1;
   }
-  m_timeZoneName.Assign(name, nameLength);
-  if (mayWarn && offset <= kFirstNamedOffset && offset >= kLastNamedOffset) {
+  AssignTimeZoneName(name, nameLength);
+  if (mayWarn && m_zoneLength && offset <= kFirstNamedOffset && offset >= kLastNamedOffset) {
     const ZoneNames& names = kZoneNames[kFirstNamedOffset - offset];
-    if (!m_timeZoneName.strcmpi(names.standard) && !m_timeZoneName.strcmpi(names.daylight))
-      Warn(OEPW_BADFORMAT, kMismatchWhere, m_timeZoneName.c_str());
+    if (!SameLetters(ZoneName(), names.standard) && !SameLetters(ZoneName(), names.daylight))
+      Warn(OEPW_BADFORMAT, kMismatchWhere, ZoneName());
   }
   return 1;
 }
@@ -366,7 +414,7 @@ unsigned short OETime::ConvertStringToOETime(const char* text) { return ReadTime
 
 unsigned short OEDateTimeBase::TextRoom(unsigned short minimum) const {
   // The longest fixed part is a five-digit year, time, fraction and "[-12:]".
-  const size_t room = 32u + m_timeZoneName.GetStrLength();
+  const size_t room = 32u + m_zoneLength;
   if (room > 0xFFFFu) return 0;
   return room < minimum ? minimum : static_cast<unsigned short>(room);
 }
@@ -383,10 +431,10 @@ char* OEDateTimeBase::WriteTimeOfDay(char* p, bool withFraction, bool withZone) 
     *p++ = '[';
     if (m_timeZoneOffset < 0) *p++ = '-';
     p = PutDigits(p, static_cast<unsigned>(m_timeZoneOffset < 0 ? -m_timeZoneOffset : m_timeZoneOffset), 1);
-    if (!m_timeZoneName.IsEmpty()) {
+    if (m_zoneLength) {
       *p++ = ':';
-      memcpy(p, m_timeZoneName.c_str(), m_timeZoneName.GetStrLength());
-      p += m_timeZoneName.GetStrLength();
+      memcpy(p, ZoneName(), m_zoneLength);
+      p += m_zoneLength;
     }
     *p++ = ']';
   }
@@ -615,7 +663,7 @@ void OEDateTimeBase::ExportBinary(void* dest, unsigned short* len) const {
     else
       OEUtility::PackShort(record + layout.offset[i], values[i]);
   }
-  const char* name = m_timeZoneName.IsEmpty() ? m_timeZoneNotInitialized : m_timeZoneName.c_str();
+  const char* name = m_zoneLength == 0 ? m_timeZoneNotInitialized : ZoneName();
   char* nameField = record + layout.offset[kRecordFields];
   int copied = 0;
   for (; copied < kRecordNameLen && name[copied] != '\0'; ++copied) nameField[copied] = name[copied];
@@ -655,7 +703,7 @@ unsigned short OEDateTimeBase::ImportBinary(const void* src) {
   if (nameLength == 0)
     ClearTimeZoneName();
   else
-    m_timeZoneName.Assign(name, nameLength);
+    AssignTimeZoneName(name, nameLength);
   return 1;
 }
 

@@ -288,6 +288,39 @@ TEST_F(DateTimeTest, ZoneNamesAreCheckedAgainstTheirOffset) {
   EXPECT_TRUE(d.GetTimeZoneName().IsEmpty());
 }
 
+// Names of up to seven characters are kept inside the value, longer ones on
+// the heap; both must survive copies, replacement and writing.
+TEST_F(DateTimeTest, LongZoneNamesAreKeptWhole) {
+  OEDateTime d(2000, 1, 1, 12);
+  const std::string longName = "Australia/Sydney";
+  EXPECT_EQ(d.SetTimeZone(longName.c_str(), 10), 1);
+  EXPECT_EQ(std::string(d.GetTimeZoneName().c_str()), longName);
+  EXPECT_TRUE(d.GetTimeZoneName().ExceedsSpecLength());
+  OEString text;
+  ASSERT_EQ(d.GetDateString(text), 1);
+  EXPECT_STREQ(text.c_str(), "20000101120000.000[10:Australia/Sydney]");
+
+  OEDateTime copy(d);
+  OEDateTime assigned;
+  assigned = d;
+  d.SetTimeZone("PACIFIC", 10);  // seven characters: back inside the value
+  EXPECT_STREQ(d.GetTimeZoneName().c_str(), "PACIFIC");
+  EXPECT_EQ(std::string(copy.GetTimeZoneName().c_str()), longName);
+  EXPECT_EQ(std::string(assigned.GetTimeZoneName().c_str()), longName);
+  const OEDateTime& same = assigned;
+  assigned = same;
+  EXPECT_EQ(std::string(assigned.GetTimeZoneName().c_str()), longName);
+
+  char record[OEDateTimeBase::kBinaryRecordLen + 1];
+  unsigned short len = 0;
+  copy.ExportBinary(record, &len);
+  OEDateTime back;
+  ASSERT_EQ(back.ImportBinary(record), 1);
+  EXPECT_STREQ(back.GetTimeZoneName().c_str(), "Austr");  // the record holds five characters
+  EXPECT_EQ(copy.ConvertStringToOEDateTime("20000101"), 1);
+  EXPECT_TRUE(copy.GetTimeZoneName().IsEmpty());
+}
+
 // ---------------------------------------------------------------------------
 // Instants: comparison, time_t and the second count
 

@@ -5,12 +5,13 @@
 // The fields are local time at the given offset: the instant in GMT is the
 // fields minus the offset. Conversions report malformed texts to the parse log
 // (OEPW_BADFORMAT, OEPW_OUTOFRANGE, OEPW_NULLPOINTER) and return 0; nothing
-// throws. Reading a text allocates nothing (a zone name reuses the storage of
-// the previous one).
+// throws. Reading a text allocates nothing: a zone name of up to seven
+// characters (every name OFX text can carry) is kept inside the value.
 #pragma once
 
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 
 #include "ofxkit/types/OEPrecisionInteger.h"
 #include "ofxkit/types/OEString.h"
@@ -31,6 +32,7 @@ class OEDateTimeBase {
   OEDateTimeBase(const OEDateTimeBase& other);
   virtual ~OEDateTimeBase() {
     if (m_binary) free(m_binary);
+    if (m_zoneLength > kZoneInline) free(ZoneHeap());
   }
 
   // The base reads no text form: returns 0 and does nothing.
@@ -56,7 +58,9 @@ class OEDateTimeBase {
   unsigned short GetSecond() const { return m_second; }
   unsigned short GetMilliseconds() const { return m_milliseconds; }
   short GetTimeZoneOffset() const { return m_timeZoneOffset; }
-  const OEString& GetTimeZoneName() const { return m_timeZoneName; }
+  // A copy of the zone name, limited to three characters like the names OFX
+  // text carries ("" when there is none).
+  OEString3 GetTimeZoneName() const;
   void SetYear(unsigned short year) { m_year = year; }
   void SetMonth(unsigned short month) { m_month = month; }
   void SetDayOfMonth(unsigned short day) { m_day = day; }
@@ -174,8 +178,16 @@ class OEDateTimeBase {
   unsigned short m_second;
   unsigned short m_milliseconds;
   short m_timeZoneOffset;
-  OEString3 m_timeZoneName;
+  // The zone name: its characters sit in m_zone while there are at most
+  // kZoneInline of them (nul-terminated); a longer name given to SetTimeZone
+  // is on the heap and m_zone holds its address. This keeps a date at 48
+  // bytes, which matters in trees of many thousand transactions.
+  static constexpr unsigned short kZoneInline = 7;
+  unsigned short m_zoneLength;
+  char m_zone[kZoneInline + 1];
   char* m_binary;
+
+  const char* ZoneName() const { return m_zoneLength > kZoneInline ? ZoneHeap() : m_zone; }
 
  private:
   // Milliseconds since 1 January 1970 GMT of the fields at their offset.
@@ -185,6 +197,13 @@ class OEDateTimeBase {
   unsigned short SetFromMillis(int64_t millis);
   unsigned short SetTimeZone(const char* name, unsigned short nameLength, short offset, bool mayWarn);
   void ClearTimeZoneName();
+  // Stores a name of length characters (not 0) at name.
+  void AssignTimeZoneName(const char* name, unsigned short length);
+  char* ZoneHeap() const {
+    char* p;
+    memcpy(&p, m_zone, sizeof p);
+    return p;
+  }
 };
 
 class OEDateTime : public OEDateTimeBase {
