@@ -143,10 +143,27 @@ OETagID Auditor::Lookup(const char* name, unsigned short length) {
 }
 
 void Auditor::WalkTree() {
-  std::vector<const OEDataObj*> pending{&m_root};
-  while (!pending.empty()) {
-    const OEDataObj* obj = pending.back();
-    pending.pop_back();
+  // Depth first with one frame per open object, so the walk holds as many
+  // frames as the tree is deep, not one entry per transaction of a list.
+  struct Frame {
+    const OEDataObj* obj;
+    const OEDataObj* extra;  // visited after the children
+    unsigned short next;
+    unsigned short count;
+  };
+  std::vector<Frame> open;
+  const OEDataObj* obj = &m_root;
+  while (obj || !open.empty()) {
+    if (!obj) {
+      Frame& top = open.back();
+      if (top.next < top.count) {
+        obj = top.obj->GetChild(top.next++);
+      } else {
+        obj = top.extra;
+        open.pop_back();
+      }
+      continue;
+    }
     const OETagID type = obj->GetType();
     ++Slot(m_inTree, type);
     if (type >= m_hasRules.size()) {
@@ -165,12 +182,11 @@ void Auditor::WalkTree() {
       }
     }
     // A securities-list response set holds its list beside its wrappers.
+    const OEDataObj* extra = nullptr;
     if (type == OE_TAG_SECLISTMSGSRSV1)
-      if (const auto* set = dynamic_cast<const OEMessageSetRs*>(obj); set && set->GetSecList())
-        pending.push_back(set->GetSecList());
-    const unsigned short n = obj->GetNumberOfChildren();
-    for (unsigned short i = n; i > 0; --i)
-      if (const OEDataObj* child = obj->GetChild(static_cast<unsigned short>(i - 1))) pending.push_back(child);
+      if (const auto* set = dynamic_cast<const OEMessageSetRs*>(obj)) extra = set->GetSecList();
+    open.push_back({obj, extra, 0, obj->GetNumberOfChildren()});
+    obj = nullptr;
   }
 }
 
