@@ -254,10 +254,17 @@ namespace {
 // Objects of up to kLargest bytes come from blocks, in size classes of
 // kGrain bytes, each class with a list of freed objects to reuse; larger ones
 // from the heap.
-constexpr size_t kGrain = 16;
+constexpr size_t kGrain = 8;
 constexpr size_t kLargest = 4096;
 constexpr size_t kClasses = kLargest / kGrain;
 constexpr size_t kBlock = size_t{2} << 20;
+// Pages of a block are made present a step at a time, just ahead of the
+// objects carved from them: one call instead of a fault per page, and at most
+// one step of memory held beyond what the objects use. Steps start small, for
+// the many programs that read one small file, and double up to the largest.
+// (Huge pages would save the calls but hold up to a whole block unused.)
+constexpr size_t kFirstPopulateStep = size_t{16} << 10;
+constexpr size_t kPopulateStep = size_t{64} << 10;
 // Blocks kept, when no object is left, for the next parse to reuse.
 constexpr size_t kKeptWhenIdle = 8;
 
@@ -268,7 +275,7 @@ struct FreeObject {
 // A block: this header, then the objects.
 struct Block {
   Block* next;
-  size_t pad;  // keeps the objects 16-byte aligned
+  size_t pad;  // keeps the first object 16-byte aligned
 };
 
 // Constant-initialized, so it is ready before any constructor runs; its
@@ -280,6 +287,8 @@ struct ObjectPool {
   Block* current = nullptr;  // the block being carved
   char* cursor = nullptr;
   char* limit = nullptr;
+  char* present = nullptr;  // pages of the current block up to here are made present
+  size_t step = kFirstPopulateStep;
   size_t live = 0;  // objects handed out and not yet freed
 };
 
@@ -299,7 +308,6 @@ Block* NewBlock() {
   if (aligned > start) munmap(mapped, aligned - start);
   if (aligned + kBlock < start + kBlock * 2) munmap(reinterpret_cast<void*>(aligned + kBlock), start + kBlock - aligned);
   memory = reinterpret_cast<void*>(aligned);
-  madvise(memory, kBlock, MADV_HUGEPAGE);
 #else
   memory = malloc(kBlock);
   if (!memory) return nullptr;
@@ -321,6 +329,23 @@ void StartCarving(ObjectPool& pool, Block* block) {
   pool.current = block;
   pool.cursor = reinterpret_cast<char*>(block + 1);
   pool.limit = reinterpret_cast<char*>(block) + kBlock;
+  pool.present = reinterpret_cast<char*>(block);
+}
+
+// Makes the next step of the current block present, once the objects reach it.
+void MakePresent(ObjectPool& pool, char* end) {
+#if defined(__linux__) && defined(MADV_POPULATE_WRITE)
+  if (end <= pool.present) return;
+  size_t step = pool.step;
+  if (pool.step < kPopulateStep) pool.step *= 2;
+  if (static_cast<size_t>(pool.limit - pool.present) < step) step = static_cast<size_t>(pool.limit - pool.present);
+  // A kernel without this request faults the pages in one at a time instead.
+  madvise(pool.present, step, MADV_POPULATE_WRITE);
+  pool.present += step;
+#else
+  (void)pool;
+  (void)end;
+#endif
 }
 
 void* TakeObject(size_t size) {
@@ -351,6 +376,7 @@ void* TakeObject(size_t size) {
   }
   void* object = pool.cursor;
   pool.cursor += bytes;
+  MakePresent(pool, pool.cursor);
   ++pool.live;
   return object;
 }

@@ -58,10 +58,10 @@ class OEDataObj {
   // Reinstalls the library's default factory.
   static void ResetFactory();
 
-  // Objects are carved from large blocks of the library's own (2 MB, backed
-  // by huge pages where the system offers them) rather than taken one by one
-  // from the heap: a statement's tree is tens of thousands of objects, and
-  // this spares each its own allocation and most of them a fresh page.
+  // Objects are carved from large blocks of the library's own (2 MB, their
+  // pages made present a step at a time ahead of use) rather than taken one
+  // by one from the heap: a statement's tree is tens of thousands of objects,
+  // and this spares each its own allocation and most of them a page fault.
   // Freed objects are reused; blocks go back to the system when no object
   // is left but for a few kept for the next parse. (Builds with
   // AddressSanitizer use the heap, so that it sees every object.)
