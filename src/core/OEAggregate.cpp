@@ -222,8 +222,8 @@ unsigned short OEAggregate::SetElementText(OETagID tag, const OEString& text) {
 OEParseStatus OEAggregate::HandleTagEnd(const OETagDictionaryEntry* const entry) {
   OEParseStatus status = OEDataObj::HandleTagEnd(entry);
   if (status == OE_PARSE_OK && !m_fields.Empty()) {
-    uint32_t used = std::min<uint32_t>((m_fields.UsedBytes() + 15u) & ~15u, kLargestBlock);
-    GetInfo().storeHint.bytes.store(static_cast<uint16_t>(used), std::memory_order_relaxed);
+    uint32_t needed = std::min<uint32_t>((m_fields.NeededBytes() + 7u) & ~7u, kLargestBlock);
+    GetInfo().storeHint.Learn(static_cast<uint16_t>(needed));
   }
   return status;
 }
@@ -420,28 +420,24 @@ void* OEFieldStore::Add(uint16_t key, uint32_t size, const OEStoreHint& hint) {
   const uint32_t needed = static_cast<uint32_t>(sizeof(Block) + sizeof(Entry)) + size;
   uint32_t bytes = std::max<uint32_t>(needed, kBlock);
   if (!m_first) bytes = std::max<uint32_t>(bytes, hint.bytes.load(std::memory_order_relaxed));
-  bytes = (bytes + 15u) & ~15u;
+  bytes = (bytes + 7u) & ~7u;
   if (bytes > kLargestBlock) return nullptr;  // no value is this large
   Block* block = static_cast<Block*>(OEPoolTake(bytes));
   if (!block) return nullptr;
-  block->next = nullptr;
+  block->next = m_first;
   block->bytes = static_cast<uint16_t>(bytes);
   block->count = 0;
   block->valuesStart = static_cast<uint16_t>(bytes);
   block->unused = 0;
-  if (m_last)
-    m_last->next = block;
-  else
-    m_first = block;
-  m_last = block;
+  m_first = block;
   return TryAdd(key, size);
 }
 
-uint32_t OEFieldStore::UsedBytes() const {
-  uint32_t used = 0;
+uint32_t OEFieldStore::NeededBytes() const {
+  uint32_t needed = sizeof(Block);
   for (const Block* b = m_first; b; b = b->next)
-    used += static_cast<uint32_t>(sizeof(Block) + b->count * sizeof(Entry) + (b->bytes - b->valuesStart));
-  return used;
+    needed += static_cast<uint32_t>(b->count * sizeof(Entry) + (b->bytes - b->valuesStart));
+  return needed;
 }
 
 void OEFieldStore::Release() {
@@ -450,7 +446,7 @@ void OEFieldStore::Release() {
     OEPoolGive(b, b->bytes);
     b = next;
   }
-  m_first = m_last = nullptr;
+  m_first = nullptr;
 }
 
 unsigned short OESetTextField(OEAggregate* self, OEString& field, OETagID tag, const OEString& text) {

@@ -249,10 +249,12 @@ constexpr uint16_t OEFieldKey(const char* name) {
 }
 #define OE_FIELD_KEY(Name) (std::integral_constant<uint16_t, OEFieldKey(#Name)>::value)
 
-// How large the first block of a class's field stores is made: what the
-// last object of the class read by a parser needed. Objects of one list are
-// mostly alike, so most keep their fields in one block that fits them; one
-// with a rare further field takes a small block more.
+// How large the first block of a class's field stores is made, learnt from
+// the objects of the class a parser reads. Objects of one list are mostly
+// alike, so most keep their fields in one block that fits them. The size
+// follows a change only when two objects in a row show it: an object with a
+// rare further field takes a small block more, and neither it nor one with a
+// field missing changes the size for the objects after it.
 struct OEStoreHint {
   OEStoreHint() = default;
   OEStoreHint(const OEStoreHint& other) : bytes(other.bytes.load(std::memory_order_relaxed)) {}
@@ -260,7 +262,23 @@ struct OEStoreHint {
     bytes.store(other.bytes.load(std::memory_order_relaxed), std::memory_order_relaxed);
     return *this;
   }
+  // Takes the bytes one block would have needed for an object just read.
+  void Learn(uint16_t needed) const {
+    const uint16_t now = bytes.load(std::memory_order_relaxed);
+    const uint16_t before = pending.load(std::memory_order_relaxed);
+    uint16_t next = now, wait = 0;
+    if (now == 0)
+      next = needed;
+    else if (needed != now && before != 0 && (before > now) == (needed > now))
+      next = before > needed ? before : needed;
+    else if (needed != now)
+      wait = needed;
+    bytes.store(next, std::memory_order_relaxed);
+    pending.store(wait, std::memory_order_relaxed);
+  }
   mutable std::atomic<uint16_t> bytes{0};
+  // What the last object needed, when that differed from bytes; 0 otherwise.
+  mutable std::atomic<uint16_t> pending{0};
 };
 
 // The fields an aggregate was given. Each value lives in a block of the
@@ -284,10 +302,10 @@ class OEFieldStore {
     return nullptr;
   }
   // Room for a new value of size bytes (at most 8-aligned) under key, in the
-  // last block when it fits; null when none is left. The caller constructs
+  // newest block when it fits; null when none is left. The caller constructs
   // the value there.
   void* TryAdd(uint16_t key, uint32_t size) {
-    Block* b = m_last;
+    Block* b = m_first;
     if (!b) return nullptr;
     size = (size + 7u) & ~7u;
     uint32_t entriesEnd = static_cast<uint32_t>(sizeof(Block) + (b->count + 1u) * sizeof(Entry));
@@ -296,13 +314,14 @@ class OEFieldStore {
     b->Entries()[b->count++] = Entry{key, b->valuesStart};
     return reinterpret_cast<char*>(b) + b->valuesStart;
   }
-  // As TryAdd, with a new block when the last one is full; the hint tells
+  // As TryAdd, with a new block when the newest one is full; the hint tells
   // the size of a first block.
   void* Add(uint16_t key, uint32_t size, const OEStoreHint& hint);
   bool Empty() const { return m_first == nullptr; }
-  // Bytes of the blocks in use (headers, entries and values).
-  uint32_t UsedBytes() const;
-  // Calls f(key, value) for every value, in the order they were made.
+  // Bytes one block holding every value would need (header, entries and
+  // values), however many blocks hold them now.
+  uint32_t NeededBytes() const;
+  // Calls f(key, value) for every value, block by block, the newest first.
   template <class F>
   void ForEach(F&& f) {
     for (Block* b = m_first; b; b = b->next) {
@@ -327,8 +346,7 @@ class OEFieldStore {
     Entry* Entries() { return reinterpret_cast<Entry*>(this + 1); }
     const Entry* Entries() const { return reinterpret_cast<const Entry*>(this + 1); }
   };
-  Block* m_first = nullptr;
-  Block* m_last = nullptr;
+  Block* m_first = nullptr;  // the newest block; each links to the one before
 };
 
 // Everything the generic code knows of one class.
