@@ -6,6 +6,7 @@
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/types/OEUtility.h"
+#include "OESideBlock.h"
 
 const char* const OEDateTimeBase::m_timeZoneNotInitialized = "***";
 
@@ -157,7 +158,7 @@ OEDateTimeBase::OEDateTimeBase(unsigned short year, unsigned short month, unsign
       m_timeZoneOffset(0),
       m_zoneLength(0),
       m_zone{},
-      m_binary(nullptr) {
+      m_hasBinary(0) {
   static_assert(sizeof m_zone >= sizeof(char*), "a long zone name's address is kept in m_zone");
 }
 
@@ -634,16 +635,16 @@ unsigned short OEDateTimeBase::operator+=(const OEDateTimeBase& amount) {
 // Binary record
 
 char* OEDateTimeBase::LockBuffer() {
-  if (m_binary == nullptr) {
-    m_binary = static_cast<char*>(calloc(kBinaryBlockSize, 1));
-    if (m_binary == nullptr) g_allocFailed = 1;
-  }
-  return m_binary;
+  char* block = OESideBlockFor(this, kBinaryBlockSize);
+  if (block == nullptr) g_allocFailed = 1;
+  m_hasBinary = block != nullptr;
+  return block;
 }
 
 void OEDateTimeBase::UnLockBuffer() {
-  free(m_binary);
-  m_binary = nullptr;
+  if (!m_hasBinary) return;
+  OEFreeSideBlock(this);
+  m_hasBinary = 0;
 }
 
 void OEDateTimeBase::ExportBinary(void* dest, unsigned short* len) const {

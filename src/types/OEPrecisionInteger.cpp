@@ -5,6 +5,7 @@
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/types/OEUtility.h"
+#include "OESideBlock.h"
 
 // The magnitude is three 32-bit words, least significant first. The helpers
 // below work on such word triples; every result is kept modulo 2^96.
@@ -226,7 +227,7 @@ void Warn(OEParseWarning warning, const char* text) {
 // Construction and assignment
 
 OEPrecisionInteger::OEPrecisionInteger()
-    : m_word{0, 0, 0}, m_sign(1), m_decimal(0), m_blocks(nullptr) {}
+    : m_word{0, 0, 0}, m_sign(1), m_hasBlocks(0), m_decimal(0) {}
 
 OEPrecisionInteger::OEPrecisionInteger(int32_t value, unsigned short decimal) : OEPrecisionInteger() {
   *this = value;
@@ -240,12 +241,12 @@ OEPrecisionInteger::OEPrecisionInteger(const char* text) : OEPrecisionInteger() 
 OEPrecisionInteger::OEPrecisionInteger(const OEPrecisionInteger& other)
     : m_word{other.m_word[0], other.m_word[1], other.m_word[2]},
       m_sign(other.m_sign),
-      m_decimal(other.m_decimal),
-      m_blocks(nullptr) {}
+      m_hasBlocks(0),
+      m_decimal(other.m_decimal) {}
 
 void OEPrecisionInteger::FreeBlocks() {
-  delete[] m_blocks;
-  m_blocks = nullptr;
+  OEFreeSideBlock(this);
+  m_hasBlocks = 0;
 }
 
 OEPrecisionInteger& OEPrecisionInteger::operator=(const char* text) {
@@ -365,11 +366,10 @@ unsigned short OEPrecisionInteger::FormatText(char* out) const {
 // (m_binaryLen bytes), made together on the first use of either; null with
 // g_allocFailed set when it cannot be had.
 char* OEPrecisionInteger::Blocks() {
-  if (m_blocks == nullptr) {
-    m_blocks = new (std::nothrow) char[kTextSize + m_binaryLen];
-    if (m_blocks == nullptr) g_allocFailed = 1;
-  }
-  return m_blocks;
+  char* blocks = OESideBlockFor(this, kTextSize + m_binaryLen);
+  if (blocks == nullptr) g_allocFailed = 1;
+  m_hasBlocks = blocks != nullptr;
+  return blocks;
 }
 
 OEPrecisionInteger::operator char*() {

@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <new>
 #include <string>
 
 #include "ofxkit/parse/OEParseLogger.h"
@@ -574,6 +575,20 @@ TEST_F(DateTimeTest, BinaryRecordVersion3IsWritten) {
   EXPECT_EQ(Text(t), "120000.123[-5:EST]");
   d.UnLockBuffer();
   d.UnLockBuffer();
+}
+
+// The lock buffer is kept apart from the value, found by the value's place:
+// a value made where another ended must not see that one's block.
+TEST_F(DateTimeTest, LockBufferOfAValueMadeWhereAnotherEndedStartsEmpty) {
+  alignas(OEDateTime) unsigned char place[sizeof(OEDateTime)];
+  OEDateTime* first = new (place) OEDateTime(2000, 1, 1);
+  memset(first->LockBuffer(), 'x', OEDateTimeBase::kBinaryBlockSize);
+  first->~OEDateTime();
+  OEDateTime* second = new (place) OEDateTime();
+  const char* block = second->LockBuffer();
+  ASSERT_NE(block, nullptr);
+  EXPECT_EQ(std::string(block, OEDateTimeBase::kBinaryBlockSize), std::string(OEDateTimeBase::kBinaryBlockSize, '\0'));
+  second->~OEDateTime();
 }
 
 TEST_F(DateTimeTest, BinaryRecordVersions1And2AreRead) {

@@ -31,7 +31,7 @@ class OEDateTimeBase {
   OEDateTimeBase();
   OEDateTimeBase(const OEDateTimeBase& other);
   virtual ~OEDateTimeBase() {
-    if (m_binary) free(m_binary);
+    if (m_hasBinary) UnLockBuffer();
     if (m_zoneLength > kZoneInline) free(ZoneHeap());
   }
 
@@ -180,12 +180,14 @@ class OEDateTimeBase {
   short m_timeZoneOffset;
   // The zone name: its characters sit in m_zone while there are at most
   // kZoneInline of them (nul-terminated); a longer name given to SetTimeZone
-  // is on the heap and m_zone holds its address. This keeps a date at 48
+  // is on the heap and m_zone holds its address. This keeps a date at 40
   // bytes, which matters in trees of many thousand transactions.
   static constexpr unsigned short kZoneInline = 7;
   unsigned short m_zoneLength;
   char m_zone[kZoneInline + 1];
-  char* m_binary;
+  // Whether the block of LockBuffer exists. It is kept beside the value, so
+  // that a date is 40 bytes.
+  uint8_t m_hasBinary;
 
   const char* ZoneName() const { return m_zoneLength > kZoneInline ? ZoneHeap() : m_zone; }
 

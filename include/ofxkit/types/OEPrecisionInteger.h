@@ -26,7 +26,7 @@ class OEPrecisionInteger {
   // Inline: amounts are destroyed by the million, and most never made either
   // block.
   virtual ~OEPrecisionInteger() {
-    if (m_blocks) FreeBlocks();
+    if (m_hasBlocks) FreeBlocks();
   }
 
   virtual OEPrecisionInteger& operator=(const char* text);
@@ -144,9 +144,12 @@ class OEPrecisionInteger {
   int CompareMagnitude(const OEPrecisionInteger& other) const;
 
   uint32_t m_word[3];  // low, middle, high words of the magnitude
-  short m_sign;        // +1 or -1
+  int8_t m_sign;       // +1 or -1
+  // Whether the text block of operator char* and the block of LockBuffer,
+  // made together on first use, exist. They are kept beside the value (see
+  // Blocks), so that an amount is 24 bytes.
+  uint8_t m_hasBlocks;
   unsigned short m_decimal;
-  char* m_blocks;  // text block of operator char*, then that of LockBuffer; made on first use
 };
 
 // A rate between 0 and 100 inclusive.
