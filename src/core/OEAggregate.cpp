@@ -417,32 +417,33 @@ void OEAggregate::DestroyFields(const OEAggregateInfo& info) {
 void* OEFieldStore::Add(uint16_t key, uint32_t size, const OEStoreHint& hint) {
   if (void* place = TryAdd(key, size)) return place;
   size = (size + 7u) & ~7u;
-  const uint32_t needed = static_cast<uint32_t>(sizeof(Block) + sizeof(Entry)) + size;
+  const uint32_t header = static_cast<uint32_t>(sizeof(Block) + (m_first ? sizeof(Block*) : 0));
+  const uint32_t needed = header + static_cast<uint32_t>(sizeof(Entry)) + size;
   uint32_t bytes = std::max<uint32_t>(needed, kBlock);
   if (!m_first) bytes = std::max<uint32_t>(bytes, hint.bytes.load(std::memory_order_relaxed));
   bytes = (bytes + 7u) & ~7u;
   if (bytes > kLargestBlock) return nullptr;  // no value is this large
   Block* block = static_cast<Block*>(OEPoolTake(bytes));
   if (!block) return nullptr;
-  block->next = m_first;
   block->bytes = static_cast<uint16_t>(bytes);
   block->count = 0;
   block->valuesStart = static_cast<uint16_t>(bytes);
-  block->unused = 0;
+  block->entriesStart = static_cast<uint16_t>(header);
+  if (m_first) memcpy(reinterpret_cast<char*>(block) + sizeof(Block), &m_first, sizeof m_first);
   m_first = block;
   return TryAdd(key, size);
 }
 
 uint32_t OEFieldStore::NeededBytes() const {
   uint32_t needed = sizeof(Block);
-  for (const Block* b = m_first; b; b = b->next)
+  for (const Block* b = m_first; b; b = b->Next())
     needed += static_cast<uint32_t>(b->count * sizeof(Entry) + (b->bytes - b->valuesStart));
   return needed;
 }
 
 void OEFieldStore::Release() {
   for (Block* b = m_first; b;) {
-    Block* next = b->next;
+    Block* next = b->Next();
     OEPoolGive(b, b->bytes);
     b = next;
   }

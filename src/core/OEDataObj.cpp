@@ -251,12 +251,15 @@ uint32_t GetOESDKDetachCount() { return g_detachCount; }
 namespace {
 
 #if !defined(OE_OBJECTS_FROM_HEAP)
-// Objects of up to kLargest bytes come from blocks, in size classes of
-// kGrain bytes, each class with a list of freed objects to reuse; larger ones
-// from the heap.
-constexpr size_t kGrain = 8;
+// Objects of up to kLargest bytes come from blocks, in size classes of the
+// pool's grain, each class with a list of freed objects to reuse; larger ones
+// from the heap. Data objects come 16 bytes apart, aligned for any type as
+// operator new promises; the blocks aggregates keep their fields in, which
+// need only 8, come from a pool of their own 8 bytes apart.
+constexpr size_t kObjectGrain = 16;
+constexpr size_t kFieldGrain = 8;
 constexpr size_t kLargest = 4096;
-constexpr size_t kClasses = kLargest / kGrain;
+constexpr size_t kClasses = kLargest / kFieldGrain;
 constexpr size_t kBlock = size_t{2} << 20;
 // Pages of a block are made present a step at a time, just ahead of the
 // objects carved from them: one call instead of a fault per page, and at most
@@ -281,6 +284,8 @@ struct Block {
 // Constant-initialized, so it is ready before any constructor runs; its
 // blocks are never unmapped at exit (objects may be deleted during exit).
 struct ObjectPool {
+  constexpr explicit ObjectPool(size_t sizeGrain) : grain(sizeGrain) {}
+  const size_t grain;
   std::mutex lock;
   FreeObject* freed[kClasses + 1] = {};
   Block* blocks = nullptr;   // every block, in the order they were had
@@ -293,21 +298,20 @@ struct ObjectPool {
 };
 
 ObjectPool& Pool() {
-  static ObjectPool pool;
+  static ObjectPool pool(kObjectGrain);
+  return pool;
+}
+
+ObjectPool& FieldPool() {
+  static ObjectPool pool(kFieldGrain);
   return pool;
 }
 
 Block* NewBlock() {
   void* memory = nullptr;
 #if defined(__linux__)
-  // Aligned to the huge page size, so the whole block can be one.
-  void* mapped = mmap(nullptr, kBlock * 2, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
-  if (mapped == MAP_FAILED) return nullptr;
-  uintptr_t start = reinterpret_cast<uintptr_t>(mapped);
-  uintptr_t aligned = (start + kBlock - 1) & ~(kBlock - 1);
-  if (aligned > start) munmap(mapped, aligned - start);
-  if (aligned + kBlock < start + kBlock * 2) munmap(reinterpret_cast<void*>(aligned + kBlock), start + kBlock - aligned);
-  memory = reinterpret_cast<void*>(aligned);
+  memory = mmap(nullptr, kBlock, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+  if (memory == MAP_FAILED) return nullptr;
 #else
   memory = malloc(kBlock);
   if (!memory) return nullptr;
@@ -348,12 +352,11 @@ void MakePresent(ObjectPool& pool, char* end) {
 #endif
 }
 
-void* TakeObject(size_t size) {
+void* TakeObject(ObjectPool& pool, size_t size) {
   if (size == 0) size = 1;
   if (size > kLargest) return ::operator new(size, std::nothrow);
-  size_t sizeClass = (size + kGrain - 1) / kGrain;
-  size_t bytes = sizeClass * kGrain;
-  ObjectPool& pool = Pool();
+  size_t sizeClass = (size + pool.grain - 1) / pool.grain;
+  size_t bytes = sizeClass * pool.grain;
   std::lock_guard<std::mutex> guard(pool.lock);
   if (FreeObject* reused = pool.freed[sizeClass]) {
     pool.freed[sizeClass] = reused->next;
@@ -399,15 +402,14 @@ void Idle(ObjectPool& pool) {
   if (pool.blocks) StartCarving(pool, pool.blocks);
 }
 
-void GiveBack(void* p, size_t size) {
+void GiveBack(ObjectPool& pool, void* p, size_t size) {
   if (!p) return;
   if (size == 0) size = 1;
   if (size > kLargest) {
     ::operator delete(p);
     return;
   }
-  size_t sizeClass = (size + kGrain - 1) / kGrain;
-  ObjectPool& pool = Pool();
+  size_t sizeClass = (size + pool.grain - 1) / pool.grain;
   std::lock_guard<std::mutex> guard(pool.lock);
   FreeObject* freed = static_cast<FreeObject*>(p);
   freed->next = pool.freed[sizeClass];
@@ -431,17 +433,17 @@ bool FromBlocks(void* p) {
 
 #if !defined(OE_OBJECTS_FROM_HEAP)
 void* OEDataObj::operator new(std::size_t size) {
-  void* p = TakeObject(size);
+  void* p = TakeObject(Pool(), size);
   if (!p) throw std::bad_alloc();
   return p;
 }
 
-void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept { return TakeObject(size); }
+void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept { return TakeObject(Pool(), size); }
 
-void OEDataObj::operator delete(void* p, std::size_t size) noexcept { GiveBack(p, size); }
+void OEDataObj::operator delete(void* p, std::size_t size) noexcept { GiveBack(Pool(), p, size); }
 
-void* OEPoolTake(std::size_t size) noexcept { return TakeObject(size); }
-void OEPoolGive(void* p, std::size_t size) noexcept { GiveBack(p, size); }
+void* OEPoolTake(std::size_t size) noexcept { return TakeObject(FieldPool(), size); }
+void OEPoolGive(void* p, std::size_t size) noexcept { GiveBack(FieldPool(), p, size); }
 
 void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept {
   // Only a constructor that threw comes here: the object is not counted as

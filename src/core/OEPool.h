@@ -1,6 +1,6 @@
 // Small blocks from the library's object pool (see OEDataObj::operator new):
 // the blocks aggregates keep their fields in. Sizes up to 4096 bytes come
-// from the pool's size classes, 8 bytes apart and 8-byte aligned; builds with
+// from a pool of their own, in size classes 8 bytes apart; builds with
 // AddressSanitizer use the heap.
 #pragma once
 

@@ -58,6 +58,7 @@
 
 #include <atomic>
 #include <cstdint>
+#include <cstring>
 #include <new>
 #include <initializer_list>
 #include <type_traits>
@@ -283,8 +284,9 @@ struct OEStoreHint {
 
 // The fields an aggregate was given. Each value lives in a block of the
 // store, under its key, from when it is made until the store is released;
-// blocks are chained, never moved. A block is its header, then its entries
-// (key and offset) growing up, then the values growing down from its end.
+// blocks are chained, never moved. A block is its header, the address of the
+// block before it (blocks after the first only), then its entries (key and
+// offset) growing up, then the values growing down from its end.
 class OEFieldStore {
  public:
   OEFieldStore() = default;
@@ -294,7 +296,7 @@ class OEFieldStore {
 
   // The value stored under key, or null.
   void* Find(uint16_t key) const {
-    for (const Block* b = m_first; b; b = b->next) {
+    for (const Block* b = m_first; b; b = b->Next()) {
       const Entry* e = b->Entries();
       for (uint16_t i = 0; i < b->count; ++i)
         if (e[i].key == key) return const_cast<char*>(reinterpret_cast<const char*>(b)) + e[i].offset;
@@ -308,7 +310,7 @@ class OEFieldStore {
     Block* b = m_first;
     if (!b) return nullptr;
     size = (size + 7u) & ~7u;
-    uint32_t entriesEnd = static_cast<uint32_t>(sizeof(Block) + (b->count + 1u) * sizeof(Entry));
+    uint32_t entriesEnd = static_cast<uint32_t>(b->entriesStart + (b->count + 1u) * sizeof(Entry));
     if (b->valuesStart < entriesEnd + size) return nullptr;
     b->valuesStart = static_cast<uint16_t>(b->valuesStart - size);
     b->Entries()[b->count++] = Entry{key, b->valuesStart};
@@ -324,7 +326,7 @@ class OEFieldStore {
   // Calls f(key, value) for every value, block by block, the newest first.
   template <class F>
   void ForEach(F&& f) {
-    for (Block* b = m_first; b; b = b->next) {
+    for (Block* b = m_first; b; b = b->Next()) {
       Entry* e = b->Entries();
       for (uint16_t i = 0; i < b->count; ++i) f(e[i].key, reinterpret_cast<char*>(b) + e[i].offset);
     }
@@ -337,14 +339,22 @@ class OEFieldStore {
     uint16_t key;
     uint16_t offset;
   };
+  // Eight bytes: most aggregates have one block, which needs no link.
   struct Block {
-    Block* next;
     uint16_t bytes;
     uint16_t count;
     uint16_t valuesStart;
-    uint16_t unused;
-    Entry* Entries() { return reinterpret_cast<Entry*>(this + 1); }
-    const Entry* Entries() const { return reinterpret_cast<const Entry*>(this + 1); }
+    uint16_t entriesStart;  // past the header, and past the link when there is one
+    Entry* Entries() { return reinterpret_cast<Entry*>(reinterpret_cast<char*>(this) + entriesStart); }
+    const Entry* Entries() const {
+      return reinterpret_cast<const Entry*>(reinterpret_cast<const char*>(this) + entriesStart);
+    }
+    Block* Next() const {
+      if (entriesStart == sizeof(Block)) return nullptr;
+      Block* next;
+      memcpy(&next, reinterpret_cast<const char*>(this) + sizeof(Block), sizeof next);
+      return next;
+    }
   };
   Block* m_first = nullptr;  // the newest block; each links to the one before
 };
