@@ -143,13 +143,14 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
     if (buffer) buffer->SetBufferOffset(static_cast<uint32_t>(engine.ItemEnd()));
     OEDataObj* current = GetCurrentObj();
     switch (kind) {
-      case OE_TAG_START:
-        if (IsValidTag(entry.id) && ReadEmptyElement(entry)) {
+      case OE_TAG_START: {
+        const bool valid = IsValidTag(entry.id) != 0;
+        if (valid && ReadEmptyElement(entry)) {
           previous = OE_TAG_ELEMENT;  // so that its end tag, when given, is passed over
           previousElement = entry.id;
           break;
         }
-        if (!IsValidTag(entry.id)) {
+        if (!valid) {
           LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
           engine.SkipCurrentTag();
           break;
@@ -157,6 +158,7 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
         status = current->HandleTagStart(&entry);
         if (status != OE_PARSE_OK) LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
         break;
+      }
       case OE_TAG_END:
         if (afterElement && entry.id == previousElement) break;  // an element's optional end tag
         status = current->HandleTagEnd(&entry);

@@ -47,4 +47,7 @@ class OEParser {
   Saved m_stack[kMaxDepth];
   int16_t m_depth;
   OEArrayOfTags m_validTags;
+  // Where IsValidTag starts looking: just after the tag it last found, since
+  // an object's tags mostly come in the order its array lists them.
+  unsigned short m_validHint = 0;
 };
