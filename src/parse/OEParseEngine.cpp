@@ -249,6 +249,30 @@ class OEParseEngine::Scanner {
     while (q < m_n && m_p[q] != '>' && !IsWs(m_p[q])) ++q;
     return q;
   }
+  // The first '<' from q (at least 0), or the end of the text; macro is set
+  // when an '&' comes before it. Eight bytes at a time while eight remain.
+  int32_t ValueEnd(int32_t q, bool& macro) const {
+    if (kLittleEndian) {
+      while (m_n - q >= 8) {
+        uint64_t w;
+        memcpy(&w, m_p + q, 8);
+        const uint64_t lt = w ^ (kOnes * '<');
+        const uint64_t amp = w ^ (kOnes * '&');
+        const uint64_t lts = (lt - kOnes) & ~lt & kHighs;
+        const uint64_t amps = (amp - kOnes) & ~amp & kHighs;
+        if (lts) {
+          // Only the lowest bit of each mask is exact: enough to order them.
+          if (amps && __builtin_ctzll(amps) < __builtin_ctzll(lts)) macro = true;
+          return q + (__builtin_ctzll(lts) >> 3);
+        }
+        if (amps) macro = true;
+        q += 8;
+      }
+    }
+    for (; q < m_n && m_p[q] != '<'; ++q)
+      if (m_p[q] == '&') macro = true;
+    return q;
+  }
   bool IsComment(const OETagItemInfo& item) const;
   // Copies the item's text into out (macros expanded when asked). 1 when all
   // of it was copied.
@@ -842,66 +866,84 @@ const OETagDictionaryEntry* OEParseEngine::GetTagID(OETagID* id) {
 
 // The shapes that make up nearly all of a file, read in one pass: a known
 // tag written plainly ("<NAME>" or "</NAME>", no spaces inside, a name
-// already met), and after a start tag its value up to the next '<'. The tag
-// becomes the current item and the value the look-ahead item, exactly as the
-// general reading would leave them. Anything else (comments, CDATA, unknown
-// or new names, odd spacing) answers null with nothing changed, and the
-// general reading takes over.
-inline const OETagDictionaryEntry* OEParseEngine::QuickTag() {
+// already met), and after a start tag its value up to the next '<'. Items,
+// entry and value end up exactly as the general reading leaves them.
+// Anything else (comments, CDATA, unknown or new names, odd spacing) answers
+// kQuickNone with nothing changed, and the general reading takes over.
+// The items are written whole, not field by field, so that reading them back
+// as a whole does not stall.
+namespace {
+constexpr int kQuickNone = -2;
+}
+
+inline int OEParseEngine::QuickTag(OETagDictionaryEntry& entry, OEString& value) {
   const char* p = m_text;
   const int32_t n = m_textEnd;
   int32_t pos = m_current.end;
-  if (pos < 0) return nullptr;
+  if (pos < 0) return kQuickNone;
   while (pos < n && IsWs(p[pos])) ++pos;
-  if (n - pos < 3 || p[pos] != '<') return nullptr;
+  if (n - pos < 3 || p[pos] != '<') return kQuickNone;
   int32_t start = pos + 1;
   OeTagItemType type = OEITEM_STARTTAG;
   if (p[start] == '/') {
     type = OEITEM_ENDTAG;
     ++start;
   }
-  if (start >= n || p[start] == '!' || p[start] == '>' || IsWs(p[start])) return nullptr;
+  if (start >= n || p[start] == '!' || p[start] == '>' || IsWs(p[start])) return kQuickNone;
   const int32_t nameEnd = Scanner(p, n, nullptr).NameEnd(start);
-  if (nameEnd >= n || p[nameEnd] != '>' || nameEnd - start >= 0xFFFF) return nullptr;
+  if (nameEnd >= n || p[nameEnd] != '>' || nameEnd - start >= 0xFFFF) return kQuickNone;
   const unsigned short length = static_cast<unsigned short>(nameEnd - start);
   uint64_t head[2];
   NameSlot* slot = nullptr;
-  const OETagDictionaryEntry* entry = CachedName(start, length, head, slot);
-  if (!entry) return nullptr;
-  m_current.type = type;
-  m_current.length = length;
-  m_current.start = start;
-  m_current.end = nameEnd + 1;
-  if (type == OEITEM_STARTTAG) {
-    int32_t v = nameEnd + 1;
-    while (v < n && IsWs(p[v])) ++v;
-    if (v < n && p[v] != '<') {
-      const void* lt = memchr(p + v, '<', static_cast<size_t>(n - v));
-      const int32_t end = lt ? static_cast<int32_t>(static_cast<const char*>(lt) - p) : n;
-      int32_t last = end;
-      while (IsWs(p[last - 1])) --last;  // stops at v, which is no whitespace
-      m_next.type = OEITEM_DATA;
-      m_next.length = Clamp16(last - v);
-      m_next.start = v;
-      m_next.end = end;
-    }
-  }
-  return entry;
-}
-
-OETagType OEParseEngine::GetOETag(OETagDictionaryEntry& entry, OEString& value) {
-  Refresh();
-  const OETagDictionaryEntry* found = m_next.type == OEITEM_NONE ? QuickTag() : nullptr;
-  if (!found) found = NextKnownTag(nullptr);
-  if (!found) return OE_TAG_DONE;
-  if (m_current.type == OEITEM_ENDTAG) {
+  const OETagDictionaryEntry* found = CachedName(start, length, head, slot);
+  if (!found) return kQuickNone;
+  OETagItemInfo tag;
+  tag.type = type;
+  tag.length = length;
+  tag.start = start;
+  tag.end = nameEnd + 1;
+  if (type == OEITEM_ENDTAG) {
+    m_current = tag;
     entry = *found;
     return OE_TAG_END;
   }
+  int32_t v = nameEnd + 1;
+  while (v < n && IsWs(p[v])) ++v;
+  if (v >= n || p[v] == '<') {  // an aggregate, or a tag that ends the text
+    m_current = tag;
+    return StartTagFollowedBy(*found, entry, value);
+  }
+  bool macro = false;  // whether the value holds an '&' to expand
+  const int32_t end = Scanner(p, n, nullptr).ValueEnd(v, macro);
+  int32_t last = end;
+  while (IsWs(p[last - 1])) --last;  // stops at v, which is no whitespace
+  OETagItemInfo data;
+  data.type = OEITEM_DATA;
+  data.length = Clamp16(last - v);
+  data.start = v;
+  data.end = end;
+  m_current = data;
+  // A value too long for a string fails as the general copy fails: emptied.
+  unsigned short copied;
+  if (macro) {
+    copied = ExpandInto(p + v, data.length, value);
+  } else {
+    value.Assign(p + v, data.length);
+    copied = value.GetStrLength() == data.length;
+  }
+  if (!copied || data.length != last - v) return OE_TAG_FAILED;
+  entry = *found;
+  return OE_TAG_ELEMENT;
+}
+
+// After the start tag just read (the current item): an aggregate's start
+// when a tag follows, else an element with its value.
+OETagType OEParseEngine::StartTagFollowedBy(const OETagDictionaryEntry& found, OETagDictionaryEntry& entry,
+                                            OEString& value) {
   switch (PeekType()) {
     case OEITEM_STARTTAG:
     case OEITEM_ENDTAG:
-      entry = *found;
+      entry = found;
       return OE_TAG_START;
     case OEITEM_DATA:
     case OEITEM_CDATA: {
@@ -909,13 +951,28 @@ OETagType OEParseEngine::GetOETag(OETagDictionaryEntry& entry, OEString& value) 
       Advance(m_current, m_next);
       // Straight from the buffer into value: no temporary copy of a password.
       if (!Scan().CopyItem(m_current, value, expand != 0)) return OE_TAG_FAILED;
-      entry = *found;
+      entry = found;
       return OE_TAG_ELEMENT;
     }
     default:  // the start tag ends the text
       value.Assign(nullptr, 0);
       return OE_TAG_FAILED;
   }
+}
+
+OETagType OEParseEngine::GetOETag(OETagDictionaryEntry& entry, OEString& value) {
+  Refresh();
+  if (m_next.type == OEITEM_NONE) {
+    const int kind = QuickTag(entry, value);
+    if (kind != kQuickNone) return static_cast<OETagType>(kind);
+  }
+  const OETagDictionaryEntry* found = NextKnownTag(nullptr);
+  if (!found) return OE_TAG_DONE;
+  if (m_current.type == OEITEM_ENDTAG) {
+    entry = *found;
+    return OE_TAG_END;
+  }
+  return StartTagFollowedBy(*found, entry, value);
 }
 
 unsigned short OEParseEngine::SkipCurrentTag() {

@@ -201,7 +201,8 @@ class OEParseEngine {
   struct NameSlot;
   const OETagDictionaryEntry* CachedName(int32_t start, unsigned short length, uint64_t head[2], NameSlot*& slot);
   const OETagDictionaryEntry* Lookup(int32_t start, unsigned short length, OETagID* id);
-  const OETagDictionaryEntry* QuickTag();
+  int QuickTag(OETagDictionaryEntry& entry, OEString& value);
+  OETagType StartTagFollowedBy(const OETagDictionaryEntry& found, OETagDictionaryEntry& entry, OEString& value);
   const OETagDictionaryEntry* LookupSlow(const char* name, unsigned short length, OETagID* id);
   const OETagDictionaryEntry* NextKnownTag(OETagID* id);
   OeTagItemType PeekType();
