@@ -177,18 +177,28 @@ const OEAggregateInfo& OEAggregate::ClassInfo() {
   return finished;
 }
 
-int32_t OEAggregate::ValidTagPosition(OETagID tag) const {
-  const OEAggregateInfo& info = GetInfo();
-  if (info.positionOf.empty()) return OEDataObj::ValidTagPosition(tag);
+namespace {
+// A tag's presence-bit position from the class's table, or -1; `fallback`
+// answers for a class whose valid tags lie too far apart for a table.
+template <class Fallback>
+inline int32_t PositionIn(const OEAggregateInfo& info, OETagID tag, Fallback fallback) {
+  if (info.positionOf.empty()) return fallback();
   uint32_t k = static_cast<uint32_t>(tag) - static_cast<uint32_t>(info.firstTag);
   int32_t position = k < info.positionOf.size() ? static_cast<int32_t>(info.positionOf[k]) - 1 : -1;
-  return position < kMaxValidTags ? position : -1;
+  return position < OEDataObj::kMaxValidTags ? position : -1;
+}
+}  // namespace
+
+int32_t OEAggregate::ValidTagPosition(OETagID tag) const {
+  return PositionIn(GetInfo(), tag, [&] { return OEDataObj::ValidTagPosition(tag); });
 }
 
 const OEFieldDesc* OEAggregate::FieldAt(OETagID tag) const {
-  int32_t position = ValidTagPosition(tag);
-  if (position < 0) return nullptr;
+  // Straight from the class's own tables: one look at the description per
+  // element a parse hands over.
   const OEAggregateInfo& info = GetInfo();
+  int32_t position = PositionIn(info, tag, [&] { return OEDataObj::ValidTagPosition(tag); });
+  if (position < 0) return nullptr;
   return static_cast<size_t>(position) < info.byPosition.size() ? info.byPosition[position] : nullptr;
 }
 
