@@ -137,6 +137,16 @@ TEST_F(DataObjTest, ValidTagFilterOfTheParser) {
   EXPECT_EQ(parser.PushObject(&obj), 1);
   EXPECT_EQ(parser.IsValidTag(Tag(120)), 1);
   EXPECT_EQ(parser.IsValidTag(Tag(99)), 0);
+  // Asked in any order (the search starts after the last tag found), every
+  // valid tag is found and nothing else.
+  for (int round = 0; round < 3; ++round) {
+    for (int i = 0; i < 40; ++i) {
+      const int k = round == 0 ? i : round == 1 ? 39 - i : (i * 7) % 40;
+      EXPECT_EQ(parser.IsValidTag(Tag(101 + k)), 1) << k;
+      EXPECT_EQ(parser.IsValidTag(Tag(141 + k)), 0) << k;
+    }
+  }
+  EXPECT_EQ(parser.IsValidTag(Tag(100)), 0);
   EXPECT_EQ(parser.PopObject(), 1);
   EXPECT_EQ(parser.IsValidTag(Tag(120)), 0);
   EXPECT_EQ(parser.PopObject(), 0);
