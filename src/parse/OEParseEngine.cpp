@@ -911,6 +911,13 @@ inline int OEParseEngine::QuickTag(OETagDictionaryEntry& entry, OEString& value)
   while (v < n && IsWs(p[v])) ++v;
   if (v >= n || p[v] == '<') {  // an aggregate, or a tag that ends the text
     m_current = tag;
+    // A '<' that opens no comment or CDATA section begins a start or end tag:
+    // an aggregate begins. The tag after it is read by the next call, from
+    // where this one ended, as the look-ahead would have read it.
+    if (v + 1 < n && p[v + 1] != '!' && !IsWs(p[v + 1])) {
+      entry = *found;
+      return OE_TAG_START;
+    }
     return StartTagFollowedBy(*found, entry, value);
   }
   bool macro = false;  // whether the value holds an '&' to expand

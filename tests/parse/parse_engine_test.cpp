@@ -186,6 +186,8 @@ TEST_F(ParseEngineTest, KnownTagsReadAlikeOnEveryPath) {
       "<OFX >< CODE>0</ OFX><OFX a=1><CODE >1</OFX >",
       // A control character inside a name, and a value that runs to the end.
       "<CO\x01" "DE>0<CODE>1<MEMO>to the end &amp; beyond  ",
+      // Aggregates followed by tags, comments, CDATA and whitespace.
+      "<OFX><!-- c --><STATUS></STATUS><BANKMSGSRSV1>\r\n</BANKMSGSRSV1><MEMO><![CDATA[x]]></OFX>",
       // The text ends right after a start tag.
       "<OFX><CODE>0<SEVERITY>",
   };
