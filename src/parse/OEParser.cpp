@@ -24,7 +24,6 @@ unsigned short OEParser::PushObject(OEDataObj* obj) {
   OEArrayOfTags valid{nullptr, 0};
   obj->GetArrayOfValidTags(valid);
   m_validTags = valid;
-  m_validHint = 0;
   obj->SetupForParsing(this);
   return 1;
 }
@@ -34,27 +33,25 @@ unsigned short OEParser::PopObject() {
   --m_depth;
   m_current = m_stack[m_depth].object;
   m_validTags = m_stack[m_depth].validTags;
-  m_validHint = 0;
   if (m_current) m_current->SetupForParsing(this);
   return 1;
 }
 
 unsigned short OEParser::SetValidTags(OEArrayOfTags& tags) {
   m_validTags = tags;
-  m_validHint = 0;
   return 1;
 }
 
 unsigned short OEParser::IsValidTag(OETagID tag) {
   if (!m_validTags.tags) return 1;
   const unsigned short n = m_validTags.count;
-  unsigned short i = m_validHint < n ? m_validHint : 0;
-  for (unsigned short k = 0; k < n; ++k) {
+  uint8_t& hint = m_validAt[static_cast<uint32_t>(tag) % kValidHints];
+  if (hint < n && m_validTags.tags[hint] == tag) return 1;
+  for (unsigned short i = 0; i < n; ++i) {
     if (m_validTags.tags[i] == tag) {
-      m_validHint = static_cast<unsigned short>(i + 1);
+      if (i <= UINT8_MAX) hint = static_cast<uint8_t>(i);
       return 1;
     }
-    if (++i == n) i = 0;
   }
   return 0;
 }

@@ -132,7 +132,7 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
   bool afterPassword = false;
   while (status == OE_PARSE_OK && previous != OE_TAG_DONE) {
     bool afterElement = previous == OE_TAG_ELEMENT;
-    const uint32_t logged = log ? log->Entries() : 0;
+    const uint32_t logged = afterPassword && log ? log->Entries() : 0;
     OETagType kind = engine.GetOETag(entry, value);
     // Whatever lies between a password tag and the next known tag is secret.
     if (afterPassword) MaskWarningsSince(logged);
