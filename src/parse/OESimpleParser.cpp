@@ -136,7 +136,8 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
     OETagType kind = engine.GetOETag(entry, value);
     // Whatever lies between a password tag and the next known tag is secret.
     if (afterPassword) MaskWarningsSince(logged);
-    afterPassword = (kind == OE_TAG_ELEMENT || kind == OE_TAG_START) && IsPasswordTag(entry.id);
+    const bool password = (kind == OE_TAG_ELEMENT || kind == OE_TAG_START) && IsPasswordTag(entry.id);
+    afterPassword = password;
     previous = kind;
     // Warnings take their position from the buffer's offset: keep it just
     // past the item being handled.
@@ -169,7 +170,6 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
           previous = OE_TAG_DONE;
         break;
       case OE_TAG_ELEMENT: {
-        bool password = IsPasswordTag(entry.id);
         if (!IsValidTag(entry.id)) {
           if (password) MaskPassword(value);
           if (!LogRecord(OEPW_INVALIDELEM, value, entry.name, entry.id)) status = OE_PARSE_NO_PARSER;
