@@ -1,6 +1,7 @@
 #include "ofxkit/core/OEAggregate.h"
 
 #include <algorithm>
+#include <atomic>
 #include <cstdlib>
 #include <cstdio>
 #include <cstring>
@@ -177,18 +178,28 @@ const OEAggregateInfo& OEAggregate::ClassInfo() {
   return finished;
 }
 
-int32_t OEAggregate::ValidTagPosition(OETagID tag) const {
-  const OEAggregateInfo& info = GetInfo();
-  if (info.positionOf.empty()) return OEDataObj::ValidTagPosition(tag);
+namespace {
+// A tag's presence-bit position from the class's table, or -1; `fallback`
+// answers for a class whose valid tags lie too far apart for a table.
+template <class Fallback>
+inline int32_t PositionIn(const OEAggregateInfo& info, OETagID tag, Fallback fallback) {
+  if (info.positionOf.empty()) return fallback();
   uint32_t k = static_cast<uint32_t>(tag) - static_cast<uint32_t>(info.firstTag);
   int32_t position = k < info.positionOf.size() ? static_cast<int32_t>(info.positionOf[k]) - 1 : -1;
-  return position < kMaxValidTags ? position : -1;
+  return position < OEDataObj::kMaxValidTags ? position : -1;
+}
+}  // namespace
+
+int32_t OEAggregate::ValidTagPosition(OETagID tag) const {
+  return PositionIn(GetInfo(), tag, [&] { return OEDataObj::ValidTagPosition(tag); });
 }
 
 const OEFieldDesc* OEAggregate::FieldAt(OETagID tag) const {
-  int32_t position = ValidTagPosition(tag);
-  if (position < 0) return nullptr;
+  // Straight from the class's own tables: one look at the description per
+  // element a parse hands over.
   const OEAggregateInfo& info = GetInfo();
+  int32_t position = PositionIn(info, tag, [&] { return OEDataObj::ValidTagPosition(tag); });
+  if (position < 0) return nullptr;
   return static_cast<size_t>(position) < info.byPosition.size() ? info.byPosition[position] : nullptr;
 }
 
@@ -403,10 +414,34 @@ void OEAggregate::ClearTagQuietly(OETagID tag) {
   if (position >= 0) ClearPresenceBit(position);
 }
 
+namespace {
+// Where the member with a key was last found, by the key's low byte: a tree
+// holds many objects of few classes, and searching a class's members for
+// every value it ends costs a mispredicted loop exit each time. A hint is
+// only a guess, checked before it is used (keys within a class are
+// distinct), so hints shared between classes, or written by another thread,
+// can cost a search but never give a wrong member.
+std::atomic<uint8_t> g_memberHint[256];
+
+inline const OEFieldDesc* MemberOf(const OEAggregateInfo& info, uint16_t key) {
+  const std::vector<const OEFieldDesc*>& members = info.members;
+  std::atomic<uint8_t>& hint = g_memberHint[key & 0xFF];
+  const size_t guess = hint.load(std::memory_order_relaxed);
+  if (guess < members.size() && members[guess]->key == key) return members[guess];
+  for (size_t i = 0; i < members.size(); ++i) {
+    if (members[i]->key == key) {
+      if (i <= 0xFF) hint.store(static_cast<uint8_t>(i), std::memory_order_relaxed);
+      return members[i];
+    }
+  }
+  return nullptr;
+}
+}  // namespace
+
 void OEAggregate::DestroyFields(const OEAggregateInfo& info) {
   if (m_fields.Empty()) return;
   m_fields.ForEach([&info](uint16_t key, void* value) {
-    if (const OEFieldDesc* d = info.MemberByKey(key))
+    if (const OEFieldDesc* d = MemberOf(info, key))
       if (d->destroy) d->destroy(value);
   });
   m_fields.Release();

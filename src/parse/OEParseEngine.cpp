@@ -55,6 +55,41 @@ inline unsigned short Clamp16(int32_t n) {
   return n <= 0 ? 0 : n >= 0xFFFF ? static_cast<unsigned short>(0xFFFF) : static_cast<unsigned short>(n);
 }
 
+constexpr uint64_t kOnes = 0x0101010101010101ull;
+constexpr uint64_t kHighs = 0x8080808080808080ull;
+constexpr bool kLittleEndian = __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__;
+
+// A mask of the high bit of each byte of w that is below 0x21 (whitespace or
+// another control character) or is '>'. Exact up to its lowest set bit, which
+// is all that is used: borrows only reach the bytes after a true match.
+inline uint64_t NameStops(uint64_t w) {
+  const uint64_t gt = w ^ (kOnes * '>');
+  return (((gt - kOnes) & ~gt) | ((w - kOnes * 0x21) & ~w)) & kHighs;
+}
+
+// The first sixteen bytes of a name of n bytes at p, zero-padded; avail is
+// how many bytes at p may be read.
+inline void NameHead(const char* p, size_t n, int32_t avail, uint64_t head[2]) {
+  if (kLittleEndian && avail >= 16) {
+    memcpy(head, p, 16);
+    if (n < 8) {
+      head[0] &= (1ull << (8 * n)) - 1;  // n is at least 1
+      head[1] = 0;
+    } else if (n < 16) {
+      head[1] &= n == 8 ? 0 : (~0ull >> (8 * (16 - n)));
+    }
+    return;
+  }
+  unsigned char bytes[16] = {};
+  memcpy(bytes, p, n < 16 ? n : 16);
+  memcpy(head, bytes, 16);
+}
+
+inline unsigned NameHash(const uint64_t head[2], size_t n, unsigned slots) {
+  const uint64_t h = (head[0] ^ (head[1] * 0x9E3779B97F4A7C15ull) ^ n) * 0xFF51AFD7ED558CCDull;
+  return static_cast<unsigned>(h >> 40) & (slots - 1);
+}
+
 // Address and usable size of a buffer's data; the size never exceeds what is
 // allocated, whatever SetBufferSize was told.
 inline void ViewOf(OEBuffer& buffer, const char*& data, uint32_t& size) {
@@ -194,6 +229,50 @@ class OEParseEngine::Scanner {
   }
 
   unsigned short ReadItem(OETagItemInfo& item);
+  // The first position from q (at least 0) of whitespace or '>', or the end
+  // of the text. Eight bytes at a time while eight remain.
+  int32_t NameEnd(int32_t q) const {
+    if (kLittleEndian) {
+      while (m_n - q >= 8) {
+        uint64_t w;
+        memcpy(&w, m_p + q, 8);
+        const uint64_t stops = NameStops(w);
+        if (!stops) {
+          q += 8;
+          continue;
+        }
+        q += __builtin_ctzll(stops) >> 3;
+        if (m_p[q] == '>' || IsWs(m_p[q])) return q;
+        ++q;  // another control character: part of the name
+      }
+    }
+    while (q < m_n && m_p[q] != '>' && !IsWs(m_p[q])) ++q;
+    return q;
+  }
+  // The first '<' from q (at least 0), or the end of the text; macro is set
+  // when an '&' comes before it. Eight bytes at a time while eight remain.
+  int32_t ValueEnd(int32_t q, bool& macro) const {
+    if (kLittleEndian) {
+      while (m_n - q >= 8) {
+        uint64_t w;
+        memcpy(&w, m_p + q, 8);
+        const uint64_t lt = w ^ (kOnes * '<');
+        const uint64_t amp = w ^ (kOnes * '&');
+        const uint64_t lts = (lt - kOnes) & ~lt & kHighs;
+        const uint64_t amps = (amp - kOnes) & ~amp & kHighs;
+        if (lts) {
+          // Only the lowest bit of each mask is exact: enough to order them.
+          if (amps && __builtin_ctzll(amps) < __builtin_ctzll(lts)) macro = true;
+          return q + (__builtin_ctzll(lts) >> 3);
+        }
+        if (amps) macro = true;
+        q += 8;
+      }
+    }
+    for (; q < m_n && m_p[q] != '<'; ++q)
+      if (m_p[q] == '&') macro = true;
+    return q;
+  }
   bool IsComment(const OETagItemInfo& item) const;
   // Copies the item's text into out (macros expanded when asked). 1 when all
   // of it was copied.
@@ -293,8 +372,7 @@ unsigned short OEParseEngine::Scanner::ReadItem(OETagItemInfo& item) {
     item.type = OEITEM_STARTTAG;
   }
   // The name runs to the first whitespace or '>'; the tag to the first '>'.
-  int32_t q = start;
-  while (q < m_n && m_p[q] != '>' && !IsWs(m_p[q])) ++q;
+  int32_t q = NameEnd(start);
   const int32_t nameEnd = q;
   if (q < m_n && m_p[q] != '>') q = FindPlainOrEnd('>', q);
   item.end = q < m_n ? q + 1 : q;
@@ -431,7 +509,7 @@ OEParseEngine::OEParseEngine(OEBuffer& buffer)
       m_textEnd(0),
       m_findMemo(),
       m_skipMemo(),
-      m_nameCache() {
+      m_names() {
   ViewOf(buffer, m_text, m_size);
   m_textEnd = TextEnd(m_text, m_size);
   ForgetSearches();
@@ -455,7 +533,7 @@ inline void OEParseEngine::Refresh() {
 }
 
 void OEParseEngine::ForgetNames() {
-  m_nameCache.Clear();
+  for (NameSlot& slot : m_names) slot = NameSlot{{0, 0}, nullptr, 0};
 }
 
 void OEParseEngine::ForgetSearches() {
@@ -711,25 +789,42 @@ unsigned short OEParseEngine::ExpandSgmlMacros(OEString& in, OEString& out) cons
 // ---------------------------------------------------------------------------
 // Tags
 
+// The cached answer for a name of length 1 or more at start, or null; sets
+// slot to where the name's answer is kept.
+inline const OETagDictionaryEntry* OEParseEngine::CachedName(int32_t start, unsigned short length, uint64_t head[2],
+                                                            NameSlot*& slot) {
+  const char* name = m_text + start;
+  NameHead(name, length, m_textEnd - start, head);
+  slot = &m_names[NameHash(head, length, kNameSlots)];
+  if (slot->length == length && slot->head[0] == head[0] && slot->head[1] == head[1] &&
+      (length <= 16 || memcmp(slot->entry->name + 16, name + 16, length - 16u) == 0))
+    return slot->entry;
+  return nullptr;
+}
+
 inline const OETagDictionaryEntry* OEParseEngine::Lookup(int32_t start, unsigned short length, OETagID* id) {
-  if (const OETagDictionaryEntry* entry = m_nameCache.Find(m_text + start, length)) {
-    if (id) *id = entry->id;
-    return entry;
-  }
   if (length == 0) {
     if (id) *id = OE_TAG_NONE;
     return nullptr;
   }
-  return LookupSlow(m_text + start, length, id);
+  uint64_t head[2];
+  NameSlot* slot = nullptr;
+  if (const OETagDictionaryEntry* cached = CachedName(start, length, head, slot)) {
+    if (id) *id = cached->id;
+    return cached;
+  }
+  const char* name = m_text + start;
+  const OETagDictionaryEntry* entry = LookupSlow(name, length, id);
+  // Only exact-case answers are kept: a lower-case name is warned about each time.
+  if (entry && memcmp(entry->name, name, length) == 0) *slot = NameSlot{{head[0], head[1]}, entry, length};
+  return entry;
 }
 
 const OETagDictionaryEntry* OEParseEngine::LookupSlow(const char* name, unsigned short length, OETagID* id) {
   OETagID found = OE_TAG_NONE;
   const OETagDictionaryEntry* entry = m_dictionary ? m_dictionary->GetTagID(name, length, &found, OE_CASE_EXACT)
                                                    : nullptr;
-  if (entry) {
-    m_nameCache.Remember(entry, name, length);
-  } else if (HasLowerCase(name, length)) {
+  if (!entry && HasLowerCase(name, length)) {
     if (m_dictionary) entry = m_dictionary->GetTagID(name, length, &found, OE_CASE_IGNORE);
     Log(OEPW_LOWERCASE, nullptr, 0, name, length, found);
   }
@@ -769,18 +864,93 @@ const OETagDictionaryEntry* OEParseEngine::GetTagID(OETagID* id) {
   return NextKnownTag(id);
 }
 
-OETagType OEParseEngine::GetOETag(OETagDictionaryEntry& entry, OEString& value) {
-  Refresh();
-  const OETagDictionaryEntry* found = NextKnownTag(nullptr);
-  if (!found) return OE_TAG_DONE;
-  if (m_current.type == OEITEM_ENDTAG) {
+// The shapes that make up nearly all of a file, read in one pass: a known
+// tag written plainly ("<NAME>" or "</NAME>", no spaces inside, a name
+// already met), and after a start tag its value up to the next '<'. Items,
+// entry and value end up exactly as the general reading leaves them.
+// Anything else (comments, CDATA, unknown or new names, odd spacing) answers
+// kQuickNone with nothing changed, and the general reading takes over.
+// The items are written whole, not field by field, so that reading them back
+// as a whole does not stall.
+namespace {
+constexpr int kQuickNone = -2;
+}
+
+inline int OEParseEngine::QuickTag(OETagDictionaryEntry& entry, OEString& value) {
+  const char* p = m_text;
+  const int32_t n = m_textEnd;
+  int32_t pos = m_current.end;
+  if (pos < 0) return kQuickNone;
+  while (pos < n && IsWs(p[pos])) ++pos;
+  if (n - pos < 3 || p[pos] != '<') return kQuickNone;
+  int32_t start = pos + 1;
+  OeTagItemType type = OEITEM_STARTTAG;
+  if (p[start] == '/') {
+    type = OEITEM_ENDTAG;
+    ++start;
+  }
+  if (start >= n || p[start] == '!' || p[start] == '>' || IsWs(p[start])) return kQuickNone;
+  const int32_t nameEnd = Scanner(p, n, nullptr).NameEnd(start);
+  if (nameEnd >= n || p[nameEnd] != '>' || nameEnd - start >= 0xFFFF) return kQuickNone;
+  const unsigned short length = static_cast<unsigned short>(nameEnd - start);
+  uint64_t head[2];
+  NameSlot* slot = nullptr;
+  const OETagDictionaryEntry* found = CachedName(start, length, head, slot);
+  if (!found) return kQuickNone;
+  OETagItemInfo tag;
+  tag.type = type;
+  tag.length = length;
+  tag.start = start;
+  tag.end = nameEnd + 1;
+  if (type == OEITEM_ENDTAG) {
+    m_current = tag;
     entry = *found;
     return OE_TAG_END;
   }
+  int32_t v = nameEnd + 1;
+  while (v < n && IsWs(p[v])) ++v;
+  if (v >= n || p[v] == '<') {  // an aggregate, or a tag that ends the text
+    m_current = tag;
+    // A '<' that opens no comment or CDATA section begins a start or end tag:
+    // an aggregate begins. The tag after it is read by the next call, from
+    // where this one ended, as the look-ahead would have read it.
+    if (v + 1 < n && p[v + 1] != '!' && !IsWs(p[v + 1])) {
+      entry = *found;
+      return OE_TAG_START;
+    }
+    return StartTagFollowedBy(*found, entry, value);
+  }
+  bool macro = false;  // whether the value holds an '&' to expand
+  const int32_t end = Scanner(p, n, nullptr).ValueEnd(v, macro);
+  int32_t last = end;
+  while (IsWs(p[last - 1])) --last;  // stops at v, which is no whitespace
+  OETagItemInfo data;
+  data.type = OEITEM_DATA;
+  data.length = Clamp16(last - v);
+  data.start = v;
+  data.end = end;
+  m_current = data;
+  // A value too long for a string fails as the general copy fails: emptied.
+  unsigned short copied;
+  if (macro) {
+    copied = ExpandInto(p + v, data.length, value);
+  } else {
+    value.Assign(p + v, data.length);
+    copied = value.GetStrLength() == data.length;
+  }
+  if (!copied || data.length != last - v) return OE_TAG_FAILED;
+  entry = *found;
+  return OE_TAG_ELEMENT;
+}
+
+// After the start tag just read (the current item): an aggregate's start
+// when a tag follows, else an element with its value.
+OETagType OEParseEngine::StartTagFollowedBy(const OETagDictionaryEntry& found, OETagDictionaryEntry& entry,
+                                            OEString& value) {
   switch (PeekType()) {
     case OEITEM_STARTTAG:
     case OEITEM_ENDTAG:
-      entry = *found;
+      entry = found;
       return OE_TAG_START;
     case OEITEM_DATA:
     case OEITEM_CDATA: {
@@ -788,13 +958,28 @@ OETagType OEParseEngine::GetOETag(OETagDictionaryEntry& entry, OEString& value) 
       Advance(m_current, m_next);
       // Straight from the buffer into value: no temporary copy of a password.
       if (!Scan().CopyItem(m_current, value, expand != 0)) return OE_TAG_FAILED;
-      entry = *found;
+      entry = found;
       return OE_TAG_ELEMENT;
     }
     default:  // the start tag ends the text
       value.Assign(nullptr, 0);
       return OE_TAG_FAILED;
   }
+}
+
+OETagType OEParseEngine::GetOETag(OETagDictionaryEntry& entry, OEString& value) {
+  Refresh();
+  if (m_next.type == OEITEM_NONE) {
+    const int kind = QuickTag(entry, value);
+    if (kind != kQuickNone) return static_cast<OETagType>(kind);
+  }
+  const OETagDictionaryEntry* found = NextKnownTag(nullptr);
+  if (!found) return OE_TAG_DONE;
+  if (m_current.type == OEITEM_ENDTAG) {
+    entry = *found;
+    return OE_TAG_END;
+  }
+  return StartTagFollowedBy(*found, entry, value);
 }
 
 unsigned short OEParseEngine::SkipCurrentTag() {

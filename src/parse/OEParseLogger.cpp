@@ -38,7 +38,7 @@ OEParseException* OEArrayElementTraits<OEParseException>::New() {
 
 OEParseLogger* OEParseLogger::ms_theOEParseLogger = nullptr;
 
-OEParseLogger* OEParseLogger::TheOEParseLogger() {
+OEParseLogger* OEParseLogger::MakeTheLogger() {
   if (!ms_theOEParseLogger) ms_theOEParseLogger = new (std::nothrow) OEParseLogger();
   return ms_theOEParseLogger;
 }

@@ -44,8 +44,15 @@ unsigned short OEParser::SetValidTags(OEArrayOfTags& tags) {
 
 unsigned short OEParser::IsValidTag(OETagID tag) {
   if (!m_validTags.tags) return 1;
-  for (unsigned short i = 0; i < m_validTags.count; ++i)
-    if (m_validTags.tags[i] == tag) return 1;
+  const unsigned short n = m_validTags.count;
+  uint8_t& hint = m_validAt[static_cast<uint32_t>(tag) % kValidHints];
+  if (hint < n && m_validTags.tags[hint] == tag) return 1;
+  for (unsigned short i = 0; i < n; ++i) {
+    if (m_validTags.tags[i] == tag) {
+      if (i <= UINT8_MAX) hint = static_cast<uint8_t>(i);
+      return 1;
+    }
+  }
   return 0;
 }
 

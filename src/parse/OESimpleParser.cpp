@@ -132,24 +132,26 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
   bool afterPassword = false;
   while (status == OE_PARSE_OK && previous != OE_TAG_DONE) {
     bool afterElement = previous == OE_TAG_ELEMENT;
-    const uint32_t logged = log ? log->Entries() : 0;
+    const uint32_t logged = afterPassword && log ? log->Entries() : 0;
     OETagType kind = engine.GetOETag(entry, value);
     // Whatever lies between a password tag and the next known tag is secret.
     if (afterPassword) MaskWarningsSince(logged);
-    afterPassword = (kind == OE_TAG_ELEMENT || kind == OE_TAG_START) && IsPasswordTag(entry.id);
+    const bool password = (kind == OE_TAG_ELEMENT || kind == OE_TAG_START) && IsPasswordTag(entry.id);
+    afterPassword = password;
     previous = kind;
     // Warnings take their position from the buffer's offset: keep it just
     // past the item being handled.
     if (buffer) buffer->SetBufferOffset(static_cast<uint32_t>(engine.ItemEnd()));
     OEDataObj* current = GetCurrentObj();
     switch (kind) {
-      case OE_TAG_START:
-        if (IsValidTag(entry.id) && ReadEmptyElement(entry)) {
+      case OE_TAG_START: {
+        const bool valid = IsValidTag(entry.id) != 0;
+        if (valid && ReadEmptyElement(entry)) {
           previous = OE_TAG_ELEMENT;  // so that its end tag, when given, is passed over
           previousElement = entry.id;
           break;
         }
-        if (!IsValidTag(entry.id)) {
+        if (!valid) {
           LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
           engine.SkipCurrentTag();
           break;
@@ -157,6 +159,7 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
         status = current->HandleTagStart(&entry);
         if (status != OE_PARSE_OK) LogRecord(OEPW_INVALIDAGG, OEString(), entry.name, entry.id);
         break;
+      }
       case OE_TAG_END:
         if (afterElement && entry.id == previousElement) break;  // an element's optional end tag
         status = current->HandleTagEnd(&entry);
@@ -167,7 +170,6 @@ OEParseStatus OESimpleParser::ReadBody(OEParseEngine& engine, OEBuffer* buffer) 
           previous = OE_TAG_DONE;
         break;
       case OE_TAG_ELEMENT: {
-        bool password = IsPasswordTag(entry.id);
         if (!IsValidTag(entry.id)) {
           if (password) MaskPassword(value);
           if (!LogRecord(OEPW_INVALIDELEM, value, entry.name, entry.id)) status = OE_PARSE_NO_PARSER;

@@ -106,8 +106,12 @@ OEDataConversion::~OEDataConversion() = default;
 int32_t OEDataConversion::FindText(const char* text, size_t length, unsigned short first, unsigned short last,
                                    const char* const* table) {
   if (!table || (length > 0 && !text)) return -1;
+  // Most texts differ in their first letter: compare that before the rest.
+  const unsigned char head = length > 0 ? FoldCase(static_cast<unsigned char>(text[0])) : 0;
   for (unsigned short i = first; i <= last; ++i) {
-    if (table[i] && SameTextIgnoringCase(text, length, table[i])) return i;
+    const char* entry = table[i];
+    if (entry && FoldCase(static_cast<unsigned char>(entry[0])) == head && SameTextIgnoringCase(text, length, entry))
+      return i;
     if (i == last) break;  // last may be 65535
   }
   return -1;

@@ -98,9 +98,27 @@ void OEString::Assign(const char* text, size_t length) {
     Release();
     return;
   }
+  if (length < m_bufferSize) {
+    // The block has room and stays where it is, so the text may even be a
+    // part of it.
+    char* block = Block();
+    memmove(block, text, length);
+    block[length] = '\0';
+    m_length = static_cast<unsigned short>(length);
+    return;
+  }
   if (m_bufferSize && text >= Block() && text < Block() + m_bufferSize) {  // assigning part of ourselves
     OEString copy(text, length);
     Assign(copy.c_str(), copy.m_length);
+    return;
+  }
+  if (m_bufferSize == 0 && length < kInlineBlock) {
+    // A first short text: written straight into the inline block, which the
+    // text and its terminator fill exactly.
+    memcpy(m_store, text, length);
+    m_store[length] = '\0';
+    m_bufferSize = static_cast<unsigned short>(length + 1);
+    m_length = static_cast<unsigned short>(length);
     return;
   }
   if (!EnsureRoom(length + 1)) return;

@@ -137,6 +137,27 @@ TEST_F(DataObjTest, ValidTagFilterOfTheParser) {
   EXPECT_EQ(parser.PushObject(&obj), 1);
   EXPECT_EQ(parser.IsValidTag(Tag(120)), 1);
   EXPECT_EQ(parser.IsValidTag(Tag(99)), 0);
+  // Asked in any order (each answer leaves a hint for the next time), every
+  // valid tag is found and nothing else, also once the array has changed.
+  for (int round = 0; round < 3; ++round) {
+    for (int i = 0; i < 40; ++i) {
+      const int k = round == 0 ? i : round == 1 ? 39 - i : (i * 7) % 40;
+      EXPECT_EQ(parser.IsValidTag(Tag(101 + k)), 1) << k;
+      EXPECT_EQ(parser.IsValidTag(Tag(141 + k)), 0) << k;
+    }
+  }
+  EXPECT_EQ(parser.IsValidTag(Tag(100)), 0);
+  OETagID reordered[3] = {Tag(140), Tag(101), Tag(120)};
+  OEArrayOfTags three{reordered, 3};
+  parser.SetValidTags(three);
+  EXPECT_EQ(parser.IsValidTag(Tag(140)) + parser.IsValidTag(Tag(101)) + parser.IsValidTag(Tag(120)), 3);
+  EXPECT_EQ(parser.IsValidTag(Tag(102)), 0);
+  reordered[0] = Tag(102);  // an array changed in place after it was used
+  EXPECT_EQ(parser.IsValidTag(Tag(102)), 1);
+  EXPECT_EQ(parser.IsValidTag(Tag(140)), 0);
+  OEArrayOfTags valid{nullptr, 0};
+  obj.GetArrayOfValidTags(valid);
+  parser.SetValidTags(valid);
   EXPECT_EQ(parser.PopObject(), 1);
   EXPECT_EQ(parser.IsValidTag(Tag(120)), 0);
   EXPECT_EQ(parser.PopObject(), 0);

@@ -167,6 +167,51 @@ TEST_F(ParseEngineTest, LexicalRules) {
   }
 }
 
+// Plain tags whose names were met before are read in one quick pass; the
+// same text with a comment before every tag is read the general way
+// throughout. Both must deliver the same tags, values and warnings. Each text
+// is read twice in a row, so that its second half meets known names.
+TEST_F(ParseEngineTest, KnownTagsReadAlikeOnEveryPath) {
+  const std::string texts[] = {
+      // Values with macros before, on and after the eight-byte steps of the
+      // value scan, and with trailing whitespace of every kind.
+      "<NAME>a&amp;b<NAME>0123456&amp;<NAME>01234567&amp;x<NAME>012345678901234&lt;<NAME>x  \t\r\n"
+      "<NAME>&amp<NAME>&<NAME>&;<MEMO>0123456789012345678901234567890123&gt;56789<MEMO>plain text past sixteen   ",
+      // Names past sixteen bytes that differ only after them, and dotted names.
+      "<CHGUSERINFOSYNCRQ><CHGUSERINFOSYNCRS></CHGUSERINFOSYNCRQ></CHGUSERINFOSYNCRS>"
+      "<V.PAYROLLENROLLRQ>x</V.PAYROLLENROLLRQ><V.PAYROLLENROLLRS>y</V.PAYROLLENROLLRS>",
+      // Lower-case names are warned about every time; unknown ones are skipped.
+      "<code>0<code>1<CODE>2<Code>3<XYZ>4<xyz>5",
+      // Odd spacing and attributes.
+      "<OFX >< CODE>0</ OFX><OFX a=1><CODE >1</OFX >",
+      // A control character inside a name, and a value that runs to the end.
+      "<CO\x01" "DE>0<CODE>1<MEMO>to the end &amp; beyond  ",
+      // Aggregates followed by tags, comments, CDATA and whitespace.
+      "<OFX><!-- c --><STATUS></STATUS><BANKMSGSRSV1>\r\n</BANKMSGSRSV1><MEMO><![CDATA[x]]></OFX>",
+      // The text ends right after a start tag.
+      "<OFX><CODE>0<SEVERITY>",
+  };
+  for (const std::string& once : texts) {
+    const std::string text = once + once;
+    log->DeleteAll();
+    const Strings quick = Tags(text);
+    const Strings quickWarnings = Warnings();
+    std::string general;
+    for (char c : text) {
+      if (c == '<') general += "<!---->";
+      general += c;
+    }
+    log->DeleteAll();
+    EXPECT_EQ(Tags(general), quick) << text;
+    EXPECT_EQ(Warnings(), quickWarnings) << text;
+  }
+  // Both readings share the memory of names met: names alike in their first
+  // sixteen bytes must still be told apart.
+  EXPECT_EQ(Tags("<CHGUSERINFOSYNCRQ></CHGUSERINFOSYNCRS><CHGUSERINFOSYNCRS></CHGUSERINFOSYNCRQ></CHGUSERINFOSYNCRS>"),
+            (Strings{"<CHGUSERINFOSYNCRQ", "</CHGUSERINFOSYNCRS", "<CHGUSERINFOSYNCRS", "</CHGUSERINFOSYNCRQ",
+                     "</CHGUSERINFOSYNCRS"}));
+}
+
 TEST_F(ParseEngineTest, MacrosExpandInPlace) {
   Load("");
   OEString in("x &lt;&gt; y"), out;

@@ -198,7 +198,11 @@ class OEParseEngine {
   // A scanner over the buffer as it is now, for the const operations.
   Scanner FreshScan() const;
   unsigned short Advance(OETagItemInfo& current, OETagItemInfo& next);
+  struct NameSlot;
+  const OETagDictionaryEntry* CachedName(int32_t start, unsigned short length, uint64_t head[2], NameSlot*& slot);
   const OETagDictionaryEntry* Lookup(int32_t start, unsigned short length, OETagID* id);
+  int QuickTag(OETagDictionaryEntry& entry, OEString& value);
+  OETagType StartTagFollowedBy(const OETagDictionaryEntry& found, OETagDictionaryEntry& entry, OEString& value);
   const OETagDictionaryEntry* LookupSlow(const char* name, unsigned short length, OETagID* id);
   const OETagDictionaryEntry* NextKnownTag(OETagID* id);
   OeTagItemType PeekType();
@@ -218,5 +222,15 @@ class OEParseEngine {
   int32_t m_textEnd;
   FindMemo m_findMemo[kFindMemos];
   SkipMemoHolder m_skipMemo;  // end tags after a failed skip
-  OETagNameCache m_nameCache;
+
+  // Recent exact-case answers of the dictionary, by a hash of the name's
+  // first sixteen bytes: names repeat heavily in a statement, and a hit costs
+  // two word comparisons (and a byte comparison of any rest past sixteen).
+  struct NameSlot {
+    uint64_t head[2];  // the first sixteen bytes of the name, zero-padded
+    const OETagDictionaryEntry* entry;
+    unsigned short length;
+  };
+  static constexpr unsigned kNameSlots = 128;
+  NameSlot m_names[kNameSlots];
 };

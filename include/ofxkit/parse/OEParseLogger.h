@@ -51,7 +51,10 @@ class OEParseLogger : public OEDynamicArrayParseException {
   // parse clears the shared one.
   OEParseLogger() : OEDynamicArrayParseException(1, 1) {}
 
-  static OEParseLogger* TheOEParseLogger();
+  // The process-wide log, made on first use (null if it could not be made;
+  // the next call tries again). Setters and conversions ask for it at every
+  // value, so the common case is inline.
+  static OEParseLogger* TheOEParseLogger() { return ms_theOEParseLogger ? ms_theOEParseLogger : MakeTheLogger(); }
 
   unsigned short AppendParseException(OEParseWarning warning, OEString value, OEString tagName, OETagID tag,
                                       OEDataObj* object);
@@ -74,6 +77,7 @@ class OEParseLogger : public OEDynamicArrayParseException {
   unsigned short DeepCopyFrom(OEParseLogger* from);
 
  private:
+  static OEParseLogger* MakeTheLogger();
   static OEParseLogger* ms_theOEParseLogger;
   unsigned short m_enabled = 1;
   unsigned short m_anyLogged = 0;

@@ -47,4 +47,9 @@ class OEParser {
   Saved m_stack[kMaxDepth];
   int16_t m_depth;
   OEArrayOfTags m_validTags;
+  // Where in the valid tags each tag (by its low bits) was last found. Only a
+  // guess, checked before it is believed, so it never goes stale: the same
+  // few classes ask about the same few tags all through a statement.
+  static constexpr unsigned kValidHints = 64;
+  uint8_t m_validAt[kValidHints] = {};
 };
