@@ -14,6 +14,7 @@
 #include "ofxkit/core/OEDataObjFactory.h"
 #include "ofxkit/core/OETagDictionary.h"
 #include "ofxkit/parse/OEParseLogger.h"
+#include "ofxkit/parse/OEParseEngine.h"
 #include "ofxkit/parse/OEParser.h"
 
 OEDataObjFactory* OEDataObj::m_factoryObj = nullptr;
@@ -261,11 +262,18 @@ constexpr size_t kFieldGrain = 8;
 constexpr size_t kLargest = 4096;
 constexpr size_t kClasses = kLargest / kFieldGrain;
 constexpr size_t kBlock = size_t{2} << 20;
-// Pages of a block are made present a step at a time, just ahead of the
-// objects carved from them: one call instead of a fault per page, and at most
-// one step of memory held beyond what the objects use. Steps start small, for
-// the many programs that read one small file, and double up to the largest.
-// (Huge pages would save the calls but hold up to a whole block unused.)
+// Page size. A block is one huge page when it will be filled: every first
+// touch of a small page is a fault (on virtual machines a costly one, taken
+// again for each of a large tree's thousands of pages), while a huge page is
+// held whole, used or not. Whether a block will be filled is projected from
+// the parse that is reading on this thread: the bytes carved so far, scaled by
+// the share of its text read. Without a parse, or when the projection falls
+// short, pages of a block are made present a step at a time just ahead of
+// the objects carved from them: one call instead of a fault per page, and at
+// most one step held beyond what the objects use. Steps start small, for the
+// many programs that read one small file, and double up to the largest. A
+// block of small pages that fills after all becomes one huge page then, for
+// the walks over the tree that follow.
 constexpr size_t kFirstPopulateStep = size_t{16} << 10;
 constexpr size_t kPopulateStep = size_t{64} << 10;
 // Blocks kept, when no object is left, for the next parse to reuse.
@@ -275,10 +283,11 @@ struct FreeObject {
   FreeObject* next;
 };
 
-// A block: this header, then the objects.
+// A block: this header (16 bytes, so the first object is 16-byte aligned),
+// then the objects.
 struct Block {
   Block* next;
-  size_t pad;  // keeps the first object 16-byte aligned
+  size_t present;  // bytes from the block's start made present (all of it for a huge page)
 };
 
 // Constant-initialized, so it is ready before any constructor runs; its
@@ -294,6 +303,7 @@ struct ObjectPool {
   char* limit = nullptr;
   char* present = nullptr;  // pages of the current block up to here are made present
   size_t step = kFirstPopulateStep;
+  size_t carved = 0;  // bytes carved since carving last started from the first block
   size_t live = 0;  // objects handed out and not yet freed
 };
 
@@ -310,14 +320,21 @@ ObjectPool& FieldPool() {
 Block* NewBlock() {
   void* memory = nullptr;
 #if defined(__linux__)
-  memory = mmap(nullptr, kBlock, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
-  if (memory == MAP_FAILED) return nullptr;
+  // Aligned to the huge page size, so that a block once filled can become one.
+  void* mapped = mmap(nullptr, kBlock * 2, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+  if (mapped == MAP_FAILED) return nullptr;
+  uintptr_t start = reinterpret_cast<uintptr_t>(mapped);
+  uintptr_t aligned = (start + kBlock - 1) & ~(kBlock - 1);
+  if (aligned > start) munmap(mapped, aligned - start);
+  if (aligned + kBlock < start + kBlock * 2) munmap(reinterpret_cast<void*>(aligned + kBlock), start + kBlock - aligned);
+  memory = reinterpret_cast<void*>(aligned);
 #else
   memory = malloc(kBlock);
   if (!memory) return nullptr;
 #endif
   Block* block = static_cast<Block*>(memory);
   block->next = nullptr;
+  block->present = 0;
   return block;
 }
 
@@ -329,26 +346,80 @@ void FreeBlock(Block* block) {
 #endif
 }
 
+#if defined(__linux__)
+#if !defined(MADV_COLLAPSE)
+constexpr int MADV_COLLAPSE = 25;
+#endif
+#endif
+
+// The parse reading on this thread, for the projection (see OEPoolReading).
+thread_local const OEParseEngine* t_reading = nullptr;
+
+// Whether the pool, carving at its present rate, will fill its current block:
+// the bytes carved so far, scaled by the share of the text still to read,
+// must reach past the block's end with a tenth to spare.
+bool WillFill(const ObjectPool& pool) {
+  if (!t_reading) return false;
+  const int32_t read = t_reading->ItemEnd();
+  const int32_t end = t_reading->TextLength();
+  if (read <= 0 || read >= end) return false;
+  const double projected = static_cast<double>(pool.carved) * end / read;
+  const double needed = static_cast<double>(pool.carved) + static_cast<double>(pool.limit - pool.cursor);
+  return projected * 0.9 >= needed;
+}
+
+void MarkHuge(ObjectPool& pool) {
+  pool.present = pool.limit;
+  pool.current->present = kBlock;
+}
+
 void StartCarving(ObjectPool& pool, Block* block) {
   pool.current = block;
   pool.cursor = reinterpret_cast<char*>(block + 1);
   pool.limit = reinterpret_cast<char*>(block) + kBlock;
-  pool.present = reinterpret_cast<char*>(block);
+  pool.present = reinterpret_cast<char*>(block) + block->present;
 }
 
-// Makes the next step of the current block present, once the objects reach it.
+// Makes the next step of the current block present, once the objects reach
+// it; or the whole block one huge page, when it will be filled.
 void MakePresent(ObjectPool& pool, char* end) {
 #if defined(__linux__) && defined(MADV_POPULATE_WRITE)
   if (end <= pool.present) return;
+  if (WillFill(pool)) {
+    // The part in use is copied into the huge page; the rest comes with it.
+    if (madvise(pool.current, kBlock, MADV_COLLAPSE) == 0) {
+      MarkHuge(pool);
+      return;
+    }
+  }
   size_t step = pool.step;
   if (pool.step < kPopulateStep) pool.step *= 2;
   if (static_cast<size_t>(pool.limit - pool.present) < step) step = static_cast<size_t>(pool.limit - pool.present);
   // A kernel without this request faults the pages in one at a time instead.
   madvise(pool.present, step, MADV_POPULATE_WRITE);
   pool.present += step;
+  pool.current->present = static_cast<size_t>(pool.present - reinterpret_cast<char*>(pool.current));
 #else
   (void)pool;
   (void)end;
+#endif
+}
+
+// Starts carving a block: one huge page when it will be filled.
+void BeginBlock(ObjectPool& pool, Block* block) {
+  StartCarving(pool, block);
+#if defined(__linux__) && defined(MADV_HUGEPAGE)
+  if (block->present < kBlock && WillFill(pool) && madvise(block, kBlock, MADV_HUGEPAGE) == 0) MarkHuge(pool);
+#endif
+}
+
+// A block of small pages that was filled becomes one huge page after all:
+// the tree in it is walked again (checks, output, its end).
+void FilledBlock(Block* block) {
+#if defined(__linux__)
+  if (block->present < kBlock && madvise(block, kBlock, MADV_COLLAPSE) == 0) block->present = kBlock;
+#else
+  (void)block;
 #endif
 }
 
@@ -364,6 +435,7 @@ void* TakeObject(ObjectPool& pool, size_t size) {
     return reused;
   }
   if (static_cast<size_t>(pool.limit - pool.cursor) < bytes) {
+    if (pool.current) FilledBlock(pool.current);
     Block* next = pool.current ? pool.current->next : nullptr;  // a block kept from before
     if (!next) {
       next = NewBlock();
@@ -375,10 +447,11 @@ void* TakeObject(ObjectPool& pool, size_t size) {
         pool.blocks = next;
       }
     }
-    StartCarving(pool, next);
+    BeginBlock(pool, next);
   }
   void* object = pool.cursor;
   pool.cursor += bytes;
+  pool.carved += bytes;
   MakePresent(pool, pool.cursor);
   ++pool.live;
   return object;
@@ -399,6 +472,7 @@ void Idle(ObjectPool& pool) {
       extra = next;
     }
   }
+  pool.carved = 0;
   if (pool.blocks) StartCarving(pool, pool.blocks);
 }
 
@@ -443,6 +517,8 @@ void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept 
 void OEDataObj::operator delete(void* p, std::size_t size) noexcept { GiveBack(Pool(), p, size); }
 
 void* OEPoolTake(std::size_t size) noexcept { return TakeObject(FieldPool(), size); }
+
+void OEPoolReading(const OEParseEngine* engine) noexcept { t_reading = engine; }
 void OEPoolGive(void* p, std::size_t size) noexcept { GiveBack(FieldPool(), p, size); }
 
 void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept {
@@ -458,6 +534,7 @@ void* OEDataObj::operator new(std::size_t size, const std::nothrow_t&) noexcept 
 void OEDataObj::operator delete(void* p, std::size_t) noexcept { ::operator delete(p); }
 
 void* OEPoolTake(std::size_t size) noexcept { return ::operator new(size, std::nothrow); }
+void OEPoolReading(const OEParseEngine*) noexcept {}
 void OEPoolGive(void* p, std::size_t) noexcept { ::operator delete(p); }
 void OEDataObj::operator delete(void* p, const std::nothrow_t&) noexcept { ::operator delete(p); }
 #endif

@@ -5,6 +5,14 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
+
+class OEParseEngine;
 
 void* OEPoolTake(std::size_t size) noexcept;
 void OEPoolGive(void* p, std::size_t size) noexcept;
+
+// The parse now reading on this thread (null when it ends). The pools project
+// from its progress how much a tree will take, to choose their page size (see
+// OEDataObj.cpp).
+void OEPoolReading(const OEParseEngine* engine) noexcept;

@@ -12,6 +12,7 @@
 #include "ofxkit/types/OEBuffer.h"
 #include "ofxkit/types/OEDataConversion.h"
 #include "ofxkit/types/OEUtility.h"
+#include "../core/OEPool.h"
 
 namespace {
 // Overwrites a password value in place, character for character.
@@ -222,6 +223,11 @@ OEParseStatus OESimpleParser::Parse(OEBuffer* buffer, OEDataObj* root, unsigned 
   OEParseStatus status = ReadHeaders(*engine, root);
   if (status == OE_PARSE_OK) {
     engine->ResetToEndOfHeader();
+    // The object pool sizes its pages from how far this reading has come.
+    struct Reading {
+      explicit Reading(const OEParseEngine* engine) { OEPoolReading(engine); }
+      ~Reading() { OEPoolReading(nullptr); }
+    } reading(engine);
     status = ReadBody(*engine, buffer);
   }
   if (status != OE_PARSE_OK && status != OE_PARSE_NO_PARSER) m_objectWithError = GetCurrentObj();

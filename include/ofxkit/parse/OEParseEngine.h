@@ -76,6 +76,8 @@ class OEParseEngine {
   // Position just past the item last read (the tag or value that GetOETag
   // delivered), for reporting where a parse stands.
   int32_t ItemEnd() const { return m_current.end; }
+  // Where the text ends, as of the last item read (0 before any).
+  int32_t TextLength() const { return m_textEnd; }
   // Tag reading resumes where the header block ended (the look-ahead slot is
   // emptied, so nothing read before is handed out again).
   void ResetToEndOfHeader();
