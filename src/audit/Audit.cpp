@@ -125,7 +125,10 @@ class Auditor {
   std::vector<int32_t> m_firstUnread;  // per tag: the start tag after as many as the tree holds
   std::vector<std::vector<ChildRule>> m_rules;  // per tag id: from the first aggregate of the tree
   std::vector<bool> m_hasRules;
+  // The open aggregates are m_frames[0, m_depth); frames past the depth are
+  // kept, with their storage, for the next aggregates opened.
   std::vector<Frame> m_frames;
+  size_t m_depth = 0;
   size_t m_untracked = 0;  // aggregates open beyond kMaxFrames
   std::vector<Group> m_groups;
   AuditReport m_report;
@@ -250,8 +253,8 @@ void Auditor::StartTag(ItemReader& reader, OETagID id, const OEParseEngine::OETa
     }
   }
   // A child of the innermost open aggregate: a single member given again?
-  if (!m_frames.empty() && m_untracked == 0 && id != OE_TAG_NONE) {
-    Frame& top = m_frames.back();
+  if (m_depth && m_untracked == 0 && id != OE_TAG_NONE) {
+    Frame& top = m_frames[m_depth - 1];
     if (top.rules) {
       for (const ChildRule& rule : *top.rules) {
         if (rule.tag != id) continue;
@@ -267,12 +270,18 @@ void Auditor::StartTag(ItemReader& reader, OETagID id, const OEParseEngine::OETa
   }
   const OEParseEngine::OeTagItemType next = reader.Peek();
   if (next == OEParseEngine::OEITEM_DATA || next == OEParseEngine::OEITEM_CDATA) return;  // an element
-  if (m_frames.size() >= kMaxFrames || m_untracked) {
+  if (m_depth >= kMaxFrames || m_untracked) {
     ++m_untracked;
     return;
   }
   const std::vector<ChildRule>* rules = id < m_hasRules.size() && m_hasRules[id] ? &m_rules[id] : nullptr;
-  m_frames.push_back({id, item.start, item.length, rules, {}});
+  if (m_depth == m_frames.size()) m_frames.emplace_back();
+  Frame& frame = m_frames[m_depth++];
+  frame.tag = id;
+  frame.nameStart = item.start;
+  frame.nameLength = item.length;
+  frame.rules = rules;
+  frame.seen.clear();
 }
 
 // An end tag closes the innermost open aggregate of its name (and any left
@@ -282,10 +291,10 @@ void Auditor::EndTag(const OEParseEngine::OETagItemInfo& item) {
     --m_untracked;
     return;
   }
-  for (size_t k = m_frames.size(); k > 0; --k) {
+  for (size_t k = m_depth; k > 0; --k) {
     const Frame& f = m_frames[k - 1];
     if (f.nameLength == item.length && SameName(m_data + f.nameStart, m_data + item.start, item.length)) {
-      m_frames.resize(k - 1);
+      m_depth = k - 1;
       return;
     }
   }
