@@ -301,7 +301,6 @@ struct ObjectPool {
   Block* current = nullptr;  // the block being carved
   char* cursor = nullptr;
   char* limit = nullptr;
-  char* present = nullptr;  // pages of the current block up to here are made present
   size_t step = kFirstPopulateStep;
   size_t carved = 0;  // bytes carved since carving last started from the first block
   size_t live = 0;  // objects handed out and not yet freed
@@ -368,23 +367,20 @@ bool WillFill(const ObjectPool& pool) {
   return projected * 0.9 >= needed;
 }
 
-void MarkHuge(ObjectPool& pool) {
-  pool.present = pool.limit;
-  pool.current->present = kBlock;
-}
+void MarkHuge(ObjectPool& pool) { pool.current->present = kBlock; }
 
 void StartCarving(ObjectPool& pool, Block* block) {
   pool.current = block;
   pool.cursor = reinterpret_cast<char*>(block + 1);
   pool.limit = reinterpret_cast<char*>(block) + kBlock;
-  pool.present = reinterpret_cast<char*>(block) + block->present;
 }
 
 // Makes the next step of the current block present, once the objects reach
 // it; or the whole block one huge page, when it will be filled.
 void MakePresent(ObjectPool& pool, char* end) {
 #if defined(__linux__) && defined(MADV_POPULATE_WRITE)
-  if (end <= pool.present) return;
+  char* present = reinterpret_cast<char*>(pool.current) + pool.current->present;
+  if (end <= present) return;
   if (WillFill(pool)) {
     // The part in use is copied into the huge page; the rest comes with it.
     if (madvise(pool.current, kBlock, MADV_COLLAPSE) == 0) {
@@ -394,11 +390,10 @@ void MakePresent(ObjectPool& pool, char* end) {
   }
   size_t step = pool.step;
   if (pool.step < kPopulateStep) pool.step *= 2;
-  if (static_cast<size_t>(pool.limit - pool.present) < step) step = static_cast<size_t>(pool.limit - pool.present);
+  if (static_cast<size_t>(pool.limit - present) < step) step = static_cast<size_t>(pool.limit - present);
   // A kernel without this request faults the pages in one at a time instead.
-  madvise(pool.present, step, MADV_POPULATE_WRITE);
-  pool.present += step;
-  pool.current->present = static_cast<size_t>(pool.present - reinterpret_cast<char*>(pool.current));
+  madvise(present, step, MADV_POPULATE_WRITE);
+  pool.current->present += step;
 #else
   (void)pool;
   (void)end;

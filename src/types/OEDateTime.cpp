@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <strings.h>
 
 #include "ofxkit/parse/OEParseLogger.h"
 #include "ofxkit/types/OEUtility.h"
@@ -11,17 +12,6 @@
 const char* const OEDateTimeBase::m_timeZoneNotInitialized = "***";
 
 namespace {
-
-// Whether two texts are the same, ASCII letters compared without regard to case.
-bool SameLetters(const char* a, const char* b) {
-  for (;; ++a, ++b) {
-    unsigned char ca = static_cast<unsigned char>(*a), cb = static_cast<unsigned char>(*b);
-    if (ca >= 'A' && ca <= 'Z') ca = static_cast<unsigned char>(ca - 'A' + 'a');
-    if (cb >= 'A' && cb <= 'Z') cb = static_cast<unsigned char>(cb - 'A' + 'a');
-    if (ca != cb) return false;
-    if (ca == 0) return true;
-  }
-}
 
 const char kDateWhere[] = "ConvertStringToOEDateTime";
 const char kTimeWhere[] = "ConvertStringToOETime";
@@ -251,7 +241,7 @@ unsigned short OEDateTimeBase::SetTimeZone(const char* name, unsigned short name
   AssignTimeZoneName(name, nameLength);
   if (mayWarn && m_zoneLength && offset <= kFirstNamedOffset && offset >= kLastNamedOffset) {
     const ZoneNames& names = kZoneNames[kFirstNamedOffset - offset];
-    if (!SameLetters(ZoneName(), names.standard) && !SameLetters(ZoneName(), names.daylight))
+    if (strcasecmp(ZoneName(), names.standard) != 0 && strcasecmp(ZoneName(), names.daylight) != 0)
       Warn(OEPW_BADFORMAT, kMismatchWhere, ZoneName());
   }
   return 1;
